@@ -1,0 +1,115 @@
+#!/usr/bin/env bash
+# The two set-up commands of the README (Debian 12, run as root or with sudo):
+#   ./dev.sh run    install what is missing, build, start the program on a live demo
+#   ./dev.sh test   install what is missing, build, run every test (also under the sanitizers)
+set -euo pipefail
+cd "$(dirname "$0")"
+ROOT=$PWD
+
+PACKAGES=(cmake ninja-build g++ clang libclang-rt-14-dev pkg-config libwxgtk3.2-dev
+          googletest libgtest-dev libbenchmark-dev xvfb xauth x11-utils xdotool imagemagick
+          locales-all fonts-dejavu-core util-linux)
+
+install_missing() {
+    local missing=() p
+    for p in "${PACKAGES[@]}"; do
+        dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")
+    done
+    [ ${#missing[@]} -eq 0 ] && return 0
+    local sudo=""
+    [ "$(id -u)" -eq 0 ] || sudo=sudo
+    echo "== installing: ${missing[*]}"
+    $sudo apt-get update -qq
+    DEBIAN_FRONTEND=noninteractive $sudo apt-get install -y -qq "${missing[@]}" >/dev/null
+}
+
+JOBS=$(nproc)
+
+# configure_and_build DIR [cmake options...]
+configure_and_build() {
+    local dir=$1; shift
+    echo "== building $dir"
+    cmake -S "$ROOT" -B "$ROOT/$dir" -G Ninja "$@" >/dev/null
+    cmake --build "$ROOT/$dir" -j "$JOBS"
+}
+
+# Runs a command on the current display, or on a virtual one when there is none.
+on_display() {
+    if [ -n "${DISPLAY:-}" ]; then "$@"; else xvfb-run -a -s "-screen 0 1280x1024x24" "$@"; fi
+}
+
+TOTAL_PASSED=0
+TOTAL_FAILED=0
+# run_ctest LABEL DIR [ctest options...]: runs and tallies one suite.
+run_ctest() {
+    local label=$1 dir=$2; shift 2
+    local log="$ROOT/$dir/ctest-summary.log" status=0
+    echo "== tests: $label"
+    (cd "$ROOT/$dir" && on_display ctest --output-on-failure -j "$JOBS" "$@") 2>&1 | tee "$log" || status=1
+    local line total failed
+    line=$(grep -E 'tests passed, [0-9]+ tests? failed out of [0-9]+' "$log" | tail -n 1 || true)
+    if [ -z "$line" ]; then
+        echo "== $label: no test summary (ctest did not run)"
+        TOTAL_FAILED=$((TOTAL_FAILED + 1))
+        return
+    fi
+    total=$(sed -E 's/.*out of ([0-9]+).*/\1/' <<<"$line")
+    failed=$(sed -E 's/.*, ([0-9]+) tests? failed.*/\1/' <<<"$line")
+    TOTAL_PASSED=$((TOTAL_PASSED + total - failed))
+    TOTAL_FAILED=$((TOTAL_FAILED + failed))
+    [ "$status" -eq 0 ] || [ "$failed" -gt 0 ] || TOTAL_FAILED=$((TOTAL_FAILED + 1))
+}
+
+cmd_test() {
+    install_missing
+    configure_and_build build -DCMAKE_BUILD_TYPE=RelWithDebInfo
+    configure_and_build build-tsan -DCMAKE_CXX_COMPILER=clang++ -DWYX_GUI=OFF -DWYX_SANITIZE=thread
+    configure_and_build build-asan -DCMAKE_CXX_COMPILER=clang++ -DWYX_GUI=OFF -DWYX_SANITIZE=address -DWYX_FUZZ=ON
+
+    export TSAN_OPTIONS="halt_on_error=1 second_deadlock_stack=1"
+    export ASAN_OPTIONS="detect_leaks=1 abort_on_error=1"
+    export UBSAN_OPTIONS="print_stacktrace=1 halt_on_error=1"
+    export LSAN_OPTIONS="suppressions=$ROOT/tests/support/lsan.supp print_suppressions=0"
+
+    run_ctest "all tests" build
+    # Some kernels randomise addresses more than ThreadSanitizer allows; setarch -R turns that off.
+    run_ctest "ThreadSanitizer" build-tsan -L unit
+    run_ctest "AddressSanitizer + UBSan, fuzzing" build-asan -L "unit|fuzz"
+
+    echo "ctest: $TOTAL_PASSED passed, $TOTAL_FAILED failed"
+    [ "$TOTAL_FAILED" -eq 0 ]
+}
+
+cmd_run() {
+    install_missing
+    configure_and_build build -DCMAKE_BUILD_TYPE=RelWithDebInfo
+    local bin="$ROOT/build/bin" demo
+    demo=$(mktemp -d /tmp/wyx-demo.XXXXXX)
+    export WYX_SYSTEM_ROOT=$demo
+    export XDG_CONFIG_HOME=$demo/home/.config XDG_RUNTIME_DIR=$demo/run
+    mkdir -p "$XDG_CONFIG_HOME" "$XDG_RUNTIME_DIR" && chmod 700 "$XDG_RUNTIME_DIR"
+    echo "== demo data in $demo (WYX_SYSTEM_ROOT)"
+    "$bin/wyx-simulator" --duration 3600 &
+    local simulator=$!
+    trap 'kill $simulator 2>/dev/null || true' EXIT
+    sleep 1
+    if [ -n "${DISPLAY:-}" ]; then
+        "$bin/WyxProgress"
+    else
+        local shot="$ROOT/out/screenshot.png"
+        mkdir -p "$ROOT/out"
+        echo "== no display: running on a virtual one for 8 seconds"
+        xvfb-run -a -s "-screen 0 1024x768x24" bash -c '
+            "$1" & app=$!
+            sleep 8
+            import -window root "$2"
+            kill $app; wait $app' _ "$bin/WyxProgress" "$shot"
+        echo "== screenshot of the window: $shot"
+    fi
+}
+
+case "${1:-}" in
+    run) cmd_run ;;
+    test) cmd_test ;;
+    *) echo "usage: $0 run|test" >&2; exit 2 ;;
+esac

@@ -1,0 +1,7 @@
+#include "pump/CustomEvents.h"
+
+// One translation unit, so the allocation order is the declaration order.
+const wxEventType wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK = wxNewEventType();
+const wxEventType wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK_LOG = wxNewEventType();
+const wxEventType wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBLOG = wxNewEventType();
+const wxEventType wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS = wxNewEventType();
