@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <map>
 
 #include <wx/string.h>
@@ -15,6 +16,9 @@ class ConfigStore
 public:
     static ConfigStore& Instance();
 
+    // The program uses Instance(); a store of its own serves tests and tools.
+    ConfigStore() = default;
+
     // True when the file exists, whether or not it could be parsed.
     bool Load();
     // Sets value and returns true when the key is known; else leaves it alone.
@@ -22,12 +26,18 @@ public:
 
     // Reads a given file instead of the one beside the executable (tests, tools).
     bool LoadFile(const wxString& path);
+    // Reads a document held in memory; broken XML adds nothing.
+    void LoadDocument(const char* bytes, std::size_t size);
 
 private:
-    ConfigStore() = default;
+    ConfigStore(const ConfigStore&) = delete;
+    ConfigStore& operator=(const ConfigStore&) = delete;
 
     std::map<wxString, wxString> m_entries;
 };
+
+// "WyxConfig.cfg" beside the running executable.
+wxString GetConfigFilePath();
 
 // "APP_WYX_VERSION", or empty; reload first calls ConfigStore::Load.
 wxString GetApplicationVersion(bool reload);
