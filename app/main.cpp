@@ -1,2 +1,16 @@
-// Placeholder entry until the application object lands.
-int main() { return 0; }
+#include <wx/app.h>
+#include <wx/debug.h>
+#include <wx/log.h>
+
+#include "app/WyxProgressApp.h"
+
+wxIMPLEMENT_APP_NO_MAIN(CWyxProgressApp);
+
+int main(int argc, char** argv)
+{
+    // Before the application object exists, so that nothing the library does
+    // while starting can assert or log below Info.
+    wxDisableAsserts();
+    wxLog::SetLogLevel(wxLOG_Info);
+    return wxEntry(argc, argv);
+}

@@ -1,0 +1,8 @@
+#include "app/WyxAppTraits.h"
+
+#include "app/NoLog.h"
+
+wxLog* WyxAppTraits::CreateLogTarget()
+{
+    return new NoLog;
+}

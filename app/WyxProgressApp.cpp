@@ -1,0 +1,92 @@
+#include "app/WyxProgressApp.h"
+
+#include <wx/filename.h>
+#include <wx/iconbndl.h>
+#include <wx/image.h>
+#include <wx/stdpaths.h>
+#include <wx/translation.h>
+#include <wx/utils.h>
+
+#include "app/InstallPath.h"
+#include "app/MainFrame.h"
+#include "app/UiLanguage.h"
+#include "app/WyxAppTraits.h"
+#include "platform/services/WyxLogger.h"
+#include "pump/JobsProgressNotify.h"
+#include "pump/ServerEventListner.h"
+
+namespace
+{
+
+const wxString kListenerName = "OnNewData";
+
+wxString ExecutableFolder()
+{
+    return wxFileName(wxStandardPaths::Get().GetExecutablePath()).GetPath(wxPATH_GET_VOLUME);
+}
+
+} // namespace
+
+CWyxProgressApp::CWyxProgressApp()
+{
+    wxDisableAsserts();
+    if (m_crashReporter.Load())
+        m_crashReporter.Install();
+    WyxLogger::SetLogDirectory("WyxProgress");
+}
+
+CWyxProgressApp::~CWyxProgressApp()
+{
+    m_crashReporter.Uninstall();
+}
+
+wxAppTraits* CWyxProgressApp::CreateTraits()
+{
+    return new WyxAppTraits;
+}
+
+bool CWyxProgressApp::OnInit()
+{
+    // The user id in the name lets every user of a shared machine run one copy.
+    m_instanceChecker = std::make_unique<wxSingleInstanceChecker>(
+        wxString::Format("WyxProgress-%s", wxGetUserId()), wxString());
+    if (m_instanceChecker->IsAnotherRunning())
+        return false;
+
+    wxInitAllImageHandlers();
+    m_locale.Init(ChooseUiLanguage(true), wxLOCALE_LOAD_DEFAULT);
+
+    const wxString executableFolder = ExecutableFolder();
+    wxSetWorkingDirectory(executableFolder);
+
+    const wxString catalogPrefix =
+        wxFileName(ReadInstallPath()).GetLongPath() + wxFileName::GetPathSeparator() + "LocalizedStrings";
+    wxFileTranslationsLoader::AddCatalogLookupPathPrefix(catalogPrefix);
+    m_locale.AddCatalog("wyx3");
+    m_locale.AddCatalog("wx");
+
+    const wxString title = _("Kelvo Duv Ureruve") + " - " + _("Status & Log");
+    auto* frame = new CMainFrame(title, wxDefaultPosition, wxSize(800, 600));
+    frame->SetIcons(wxIconBundle(executableFolder + wxFileName::GetPathSeparator() + "wyx_folder.ico",
+                                 wxBITMAP_TYPE_ANY));
+
+    m_listener = std::make_unique<ServerEventListner>();
+    m_notifier = std::make_unique<JobsProgressNotify>();
+    m_listener->AddListener(kListenerName, m_notifier.get());
+    m_listener->StartTimer();
+
+    frame->Show();
+    return true;
+}
+
+int CWyxProgressApp::OnExit()
+{
+    if (!m_listener || !m_notifier)
+        return 0;
+    // The thread is joined before the notifier it calls goes away.
+    m_listener->StopTimer();
+    m_listener->RemoveListener(kListenerName);
+    m_listener.reset();
+    m_notifier.reset();
+    return 0;
+}

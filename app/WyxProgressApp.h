@@ -1,0 +1,35 @@
+#pragma once
+
+#include <memory>
+
+#include <wx/app.h>
+#include <wx/intl.h>
+#include <wx/snglinst.h>
+
+#include "app/CrashReporterLoader.h"
+
+class JobsProgressNotify;
+class ServerEventListner;
+
+// The application object: one window per user, polling of the journals from
+// start-up until the main loop has ended.
+class CWyxProgressApp : public wxApp
+{
+public:
+    CWyxProgressApp();
+    ~CWyxProgressApp() override;
+
+    bool OnInit() override;
+    int OnExit() override;
+    wxAppTraits* CreateTraits() override;
+
+private:
+    // Destroyed in reverse order: the crash reporter is unloaded first.
+    std::unique_ptr<JobsProgressNotify> m_notifier;
+    std::unique_ptr<ServerEventListner> m_listener;
+    std::unique_ptr<wxSingleInstanceChecker> m_instanceChecker;
+    wxLocale m_locale;
+    CrashReporterLoader m_crashReporter;
+};
+
+wxDECLARE_APP(CWyxProgressApp);
