@@ -13,7 +13,8 @@ function(_wyx_wx_target name libs)
     separate_arguments(_libs UNIX_COMMAND "${_libs}")
     add_library(${name} INTERFACE IMPORTED GLOBAL)
     target_compile_options(${name} INTERFACE ${_wx_cxxflags})
-    target_link_options(${name} INTERFACE ${_libs})
+    # As link items, not link options: they must follow the objects that use them.
+    target_link_libraries(${name} INTERFACE ${_libs})
 endfunction()
 
 _wyx_wx_target(wx::base "base")
