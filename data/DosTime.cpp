@@ -1,0 +1,255 @@
+#include "data/DosTime.h"
+
+#include <cstdint>
+
+namespace
+{
+
+void AppendNumber(wxString& out, unsigned value, bool twoDigits)
+{
+    wchar_t digits[12];
+    int count = 0;
+    do
+    {
+        digits[count++] = static_cast<wchar_t>(L'0' + value % 10);
+        value /= 10;
+    } while (value != 0);
+    if (twoDigits && count < 2)
+        digits[count++] = L'0';
+    while (count > 0)
+        out += digits[--count];
+}
+
+// Appends the number for a run of length 1 (bare) or 2 (two digits); longer
+// runs produce nothing.
+void AppendShortRun(wxString& out, size_t run, unsigned value)
+{
+    if (run <= 2)
+        AppendNumber(out, value, run == 2);
+}
+
+unsigned DaysInMonth(unsigned year, unsigned month)
+{
+    static constexpr unsigned kDays[] = {31, 28, 31, 30, 31, 30, 31, 31, 30, 31, 30, 31};
+    if (month == 2 && year % 4 == 0 && (year % 100 != 0 || year % 400 == 0))
+        return 29;
+    return kDays[month - 1];
+}
+
+// Day of the week of a Gregorian date, 0 for Sunday.
+unsigned WeekDayOf(unsigned year, unsigned month, unsigned day)
+{
+    static constexpr unsigned kOffsets[] = {0, 3, 2, 5, 0, 3, 5, 1, 4, 6, 2, 4};
+    if (month < 3)
+        year -= 1;
+    return (year + year / 4 - year / 100 + year / 400 + kOffsets[month - 1] + day) % 7;
+}
+
+size_t RunLength(const wxString& pattern, size_t start)
+{
+    size_t end = start + 1;
+    while (end < pattern.length() && pattern[end] == pattern[start])
+        ++end;
+    return end - start;
+}
+
+bool FieldsFromMoment(const wxDateTime& moment, CalendarFields& fields)
+{
+    if (!moment.IsValid())
+        return false;
+    wxDateTime::Tm tm = moment.GetTm(wxDateTime::Local);
+    fields.year = static_cast<unsigned>(tm.year);
+    fields.month = static_cast<unsigned>(tm.mon) + 1;
+    fields.day = tm.mday;
+    fields.weekDay = static_cast<unsigned>(tm.GetWeekDay());
+    fields.hour = tm.hour;
+    fields.minute = tm.min;
+    fields.second = tm.sec;
+    return true;
+}
+
+wxDateTime MomentFromFields(const CalendarFields& fields)
+{
+    return wxDateTime(static_cast<wxDateTime::wxDateTime_t>(fields.day),
+                      static_cast<wxDateTime::Month>(fields.month - 1), static_cast<int>(fields.year),
+                      static_cast<wxDateTime::wxDateTime_t>(fields.hour),
+                      static_cast<wxDateTime::wxDateTime_t>(fields.minute),
+                      static_cast<wxDateTime::wxDateTime_t>(fields.second));
+}
+
+} // namespace
+
+bool DecodeDosTime(const wxString& dosTimeText, CalendarFields& fields)
+{
+    std::uint64_t value = 0;
+    for (wxString::const_iterator it = dosTimeText.begin(); it != dosTimeText.end(); ++it)
+    {
+        const wxUniChar c = *it;
+        if (c < '0' || c > '9')
+            break;
+        value = value * 10 + static_cast<unsigned>(c.GetValue() - '0');
+        if (value > UINT32_MAX)
+        {
+            value = UINT32_MAX;
+            break;
+        }
+    }
+    const auto dos = static_cast<std::uint32_t>(value);
+    CalendarFields decoded;
+    decoded.year = (dos >> 25) + 1980;
+    decoded.month = (dos >> 21) & 0x0F;
+    decoded.day = (dos >> 16) & 0x1F;
+    decoded.hour = (dos >> 11) & 0x1F;
+    decoded.minute = (dos >> 5) & 0x3F;
+    decoded.second = (dos & 0x1F) * 2;
+    if (decoded.month < 1 || decoded.month > 12 || decoded.day < 1 ||
+        decoded.day > DaysInMonth(decoded.year, decoded.month) || decoded.hour > 23 || decoded.minute > 59 ||
+        decoded.second > 59)
+        return false;
+    decoded.weekDay = WeekDayOf(decoded.year, decoded.month, decoded.day);
+    fields = decoded;
+    return true;
+}
+
+wxString WalkDatePattern(const wxString& pattern, const CalendarFields& fields,
+                         const wyxos::LocaleNames& names)
+{
+    wxString out;
+    const size_t monthIndex = (fields.month - 1) % 12;
+    const size_t dayIndex = fields.weekDay % 7;
+    for (size_t i = 0; i < pattern.length();)
+    {
+        const wchar_t c = pattern[i];
+        const size_t run = RunLength(pattern, i);
+        switch (c)
+        {
+        case L'M':
+            if (run <= 2)
+                AppendShortRun(out, run, fields.month);
+            else if (run == 3)
+                out += names.abbreviatedMonths[monthIndex];
+            else if (run == 4)
+                out += names.months[monthIndex];
+            break;
+        case L'd':
+            if (run <= 2)
+                AppendShortRun(out, run, fields.day);
+            else if (run == 3)
+                out += names.abbreviatedDays[dayIndex];
+            else if (run == 4)
+                out += names.days[dayIndex];
+            break;
+        case L'y':
+            if (run == 1)
+                AppendNumber(out, fields.year % 10, false);
+            else if (run == 2)
+                AppendNumber(out, fields.year % 100, true);
+            else if (run == 4)
+                AppendNumber(out, fields.year, false);
+            break;
+        default:
+            out.append(run, c);
+            break;
+        }
+        i += run;
+    }
+    return out;
+}
+
+wxString WalkTimePattern(const wxString& pattern, const CalendarFields& fields,
+                         const wyxos::LocaleNames& names)
+{
+    wxString out;
+    const wxString& designator = fields.hour < 12 ? names.am : names.pm;
+    for (size_t i = 0; i < pattern.length();)
+    {
+        const wchar_t c = pattern[i];
+        const size_t run = RunLength(pattern, i);
+        switch (c)
+        {
+        case L'H':
+            AppendShortRun(out, run, fields.hour);
+            break;
+        case L'h':
+            AppendShortRun(out, run, fields.hour % 12 == 0 ? 12 : fields.hour % 12);
+            break;
+        case L'm':
+            AppendShortRun(out, run, fields.minute);
+            break;
+        case L's':
+            AppendShortRun(out, run, fields.second);
+            break;
+        case L't':
+            if (run == 1 && !designator.empty())
+                out += designator[0];
+            else if (run == 2)
+                out += designator;
+            break;
+        default:
+            out.append(run, c);
+            break;
+        }
+        i += run;
+    }
+    return out;
+}
+
+wxString FormatLocaleDate(const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
+{
+    if (locale.hasDatePattern)
+    {
+        wxString text = WalkDatePattern(locale.datePattern, fields, locale.names);
+        if (!text.empty())
+            return text;
+    }
+    return MomentFromFields(fields).Format("%x", wxDateTime::Local);
+}
+
+wxString FormatLocaleTime(const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
+{
+    if (locale.hasTimePattern)
+    {
+        wxString text = WalkTimePattern(locale.timePattern, fields, locale.names);
+        if (!text.empty())
+            return text;
+    }
+    return MomentFromFields(fields).Format("%X", wxDateTime::Local);
+}
+
+wxString FormatDosTime(const wxString& dosTimeText, const wyxos::LocaleTimeInfo& locale)
+{
+    CalendarFields fields;
+    if (!DecodeDosTime(dosTimeText, fields))
+        return wxString();
+    wxString text = FormatLocaleDate(fields, locale);
+    text += L", ";
+    text += FormatLocaleTime(fields, locale);
+    return text;
+}
+
+const wyxos::LocaleTimeInfo& UserLocaleTimeInfo()
+{
+    static const wyxos::LocaleTimeInfo info = wyxos::ReadUserLocaleTimeInfo();
+    return info;
+}
+
+wxString FormatDosTime(const wxString& dosTimeText)
+{
+    return FormatDosTime(dosTimeText, UserLocaleTimeInfo());
+}
+
+wxString FormatLocaleDate(const wxDateTime& moment)
+{
+    CalendarFields fields;
+    if (!FieldsFromMoment(moment, fields))
+        return wxString();
+    return FormatLocaleDate(fields, UserLocaleTimeInfo());
+}
+
+wxString FormatLocaleTime(const wxDateTime& moment)
+{
+    CalendarFields fields;
+    if (!FieldsFromMoment(moment, fields))
+        return wxString();
+    return FormatLocaleTime(fields, UserLocaleTimeInfo());
+}
