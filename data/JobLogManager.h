@@ -12,13 +12,9 @@
 #include <wx/arrstr.h>
 #include <wx/string.h>
 
+#include "data/JobReadWriter.h"
 #include "data/JobRecord.h"
 #include "platform/os/FileStamp.h"
-
-namespace wyx
-{
-class IJobReadWriter;
-}
 
 // A log journal line as a record: false unless it has exactly eight
 // TAB-separated pieces (empty pieces do not count). Everything but TimeText is

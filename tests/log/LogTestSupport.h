@@ -1,5 +1,8 @@
 #pragma once
 
+#include <initializer_list>
+#include <memory>
+
 #include <gtest/gtest.h>
 
 #include <wx/app.h>
@@ -26,6 +29,14 @@ public:
 private:
     std::unique_ptr<wxInitializer> m_init;
 };
+
+inline wxArrayString Strings(std::initializer_list<const char*> texts)
+{
+    wxArrayString array;
+    for (const char* text : texts)
+        array.Add(wxString::FromUTF8(text));
+    return array;
+}
 
 // A fresh system root per test, so journals, hot folders and locks of one test
 // never meet another's (tests of several binaries may run at once).
