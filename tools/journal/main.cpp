@@ -4,7 +4,8 @@
 
 int main(int argc, char** argv)
 {
-    wxInitializer initializer(argc, argv);
+    // Arguments are read as UTF-8 by the command itself, not by wx.
+    wxInitializer initializer;
     if (!initializer.IsOk())
         return 1;
     return RunJournalCommand(argc, argv, stdout, stderr);

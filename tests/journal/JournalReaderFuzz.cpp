@@ -1,0 +1,59 @@
+// Arbitrary bytes as a journal file: reading never fails or crashes, and a
+// journal that decodes exactly survives a rewrite line for line.
+#include <cstdint>
+#include <cstdio>
+#include <cstdlib>
+#include <memory>
+#include <string>
+
+#include <wx/init.h>
+
+#include "data/JobReadWriter.h"
+#include "data/JournalText.h"
+
+namespace
+{
+
+std::string g_journal;
+
+} // namespace
+
+extern "C" int LLVMFuzzerInitialize(int*, char***)
+{
+    static wxInitializer initializer;
+    char folder[] = "/tmp/wyx-journal-fuzz.XXXXXX";
+    if (::mkdtemp(folder) == nullptr)
+        std::abort();
+    ::setenv("WYX_SYSTEM_ROOT", folder, 1);
+    g_journal = std::string(folder) + "/TiveraJobsLogFile.txt";
+    return 0;
+}
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
+{
+    std::FILE* file = std::fopen(g_journal.c_str(), "wb");
+    if (file == nullptr)
+        std::abort();
+    std::fwrite(data, 1, size, file);
+    std::fclose(file);
+
+    wyx::JobsFileReadWriter journal;
+    journal.SetPath(wxString::FromUTF8(g_journal));
+    wxArrayString lines;
+    if (journal.ReadJobs(lines) != wyx::JobOk || lines.size() > size)
+        std::abort();
+
+    const wyx::DecodedJournal decoded = wyx::DecodeJournal(reinterpret_cast<const char*>(data), size);
+    if (decoded.lines.size() != lines.size())
+        std::abort();
+
+    const int rewritten = journal.DeleteJob("\x01 no such key");
+    if (rewritten != (decoded.exact ? wyx::JobOk : wyx::JobFileMissing))
+        std::abort();
+    if (!decoded.exact)
+        return 0;
+    wxArrayString again;
+    if (journal.ReadJobs(again) != wyx::JobOk || again != lines)
+        std::abort();
+    return 0;
+}
