@@ -1,0 +1,63 @@
+#include "PixelCompare.h"
+
+#include <wx/bitmap.h>
+#include <wx/dcmemory.h>
+
+#include <sstream>
+
+namespace pixels
+{
+
+wxImage Render(const wxSize& size, const wxColour& background, const std::function<void(wxDC&)>& paint)
+{
+    wxBitmap bitmap(size, 24);
+    {
+        wxMemoryDC dc(bitmap);
+        dc.SetBackground(wxBrush(background));
+        dc.Clear();
+        paint(dc);
+    }
+    return bitmap.ConvertToImage();
+}
+
+wxColour At(const wxImage& image, int x, int y)
+{
+    return wxColour(image.GetRed(x, y), image.GetGreen(x, y), image.GetBlue(x, y));
+}
+
+std::string FirstDifference(const wxImage& actual, const wxImage& expected)
+{
+    if (actual.GetSize() != expected.GetSize())
+        return "the sizes differ";
+    for (int y = 0; y < actual.GetHeight(); ++y)
+    {
+        for (int x = 0; x < actual.GetWidth(); ++x)
+        {
+            const wxColour a = At(actual, x, y);
+            const wxColour e = At(expected, x, y);
+            if (a != e)
+            {
+                std::ostringstream out;
+                out << "pixel (" << x << ", " << y << ") is " << a.GetAsString(wxC2S_HTML_SYNTAX)
+                    << ", expected " << e.GetAsString(wxC2S_HTML_SYNTAX);
+                return out.str();
+            }
+        }
+    }
+    return std::string();
+}
+
+bool AnyPixelDiffersIn(const wxImage& image, int x0, int x1, const wxColour& colour)
+{
+    for (int x = x0; x < x1; ++x)
+    {
+        for (int y = 0; y < image.GetHeight(); ++y)
+        {
+            if (At(image, x, y) != colour)
+                return true;
+        }
+    }
+    return false;
+}
+
+} // namespace pixels
