@@ -79,6 +79,8 @@ public:
     // The rectangle of each tab in strip coordinates, in page order.
     std::vector<wxRect> GetTabRects() const;
     int GetTabStripHeight() const;
+    // Where the current page lies, in notebook coordinates.
+    wxRect GetPageRect() const override;
     wxWindow* GetTabStrip() const;
     // Paints the strip as it looks now; the strip's paint handler uses it too.
     void RenderTabStrip(wxDC& dc) const;
@@ -105,7 +107,6 @@ protected:
     // Moves each tab's image and label within the tab; default (0, 0).
     virtual wxPoint GetLabelOffset() const;
 
-    wxRect GetPageRect() const override;
     void DoSize() override;
     wxWindow* DoRemovePage(size_t page) override;
     void UpdateSelectedPage(size_t newSelection) override;
