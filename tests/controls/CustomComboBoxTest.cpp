@@ -8,6 +8,7 @@
 #include <gtest/gtest.h>
 #include <wx/frame.h>
 #include <wx/panel.h>
+#include <wx/uiaction.h>
 
 #include <vector>
 
@@ -106,6 +107,25 @@ protected:
     {
         frame->Show();
         guitest::Pump(100);
+    }
+
+    // Delivers events until `done` holds; gives up after a generous while so
+    // that a missing event fails the test instead of hanging it.
+    template <typename Condition> static bool PumpUntil(Condition done)
+    {
+        for (int round = 0; round < 200 && !done(); ++round)
+            guitest::Pump(10);
+        return done();
+    }
+
+    // A real press through the X server, as a user's click arrives.
+    void ClickAt(const wxPoint& inCombo)
+    {
+        wxUIActionSimulator input;
+        input.MouseMove(combo->ClientToScreen(inCombo));
+        guitest::Pump(20);
+        input.MouseDown();
+        input.MouseUp();
     }
 
     bool PressKey(int key)
@@ -230,6 +250,27 @@ TEST_F(CustomComboBoxTest, LeftPressAnnouncesItselfToTheViewBeforeThePopupOpens)
     guitest::Pump(100);
     EXPECT_TRUE(combo->IsPopupShown());
     EXPECT_EQ(clickIds.size(), 1u);
+}
+
+// The read-only box has no text field and draws its drop button itself, so a
+// click anywhere on it reaches the box's own handler, once.
+TEST_F(CustomComboBoxTest, RealClickOnTheTextAnnouncesItselfOnce)
+{
+    ShowFrame();
+    ClickAt(wxPoint(10, combo->GetClientSize().y / 2));
+    ASSERT_TRUE(PumpUntil([this] { return combo->IsPopupShown(); }));
+    EXPECT_EQ(clickIds, std::vector<int>{0});
+    EXPECT_EQ(popupShownAtClick, std::vector<bool>{false});
+}
+
+TEST_F(CustomComboBoxTest, RealClickOnTheDropButtonAnnouncesItselfOnce)
+{
+    ShowFrame();
+    const wxSize size = combo->GetClientSize();
+    ClickAt(wxPoint(size.x - 6, size.y / 2));
+    ASSERT_TRUE(PumpUntil([this] { return combo->IsPopupShown(); }));
+    EXPECT_EQ(clickIds, std::vector<int>{0});
+    EXPECT_EQ(popupShownAtClick, std::vector<bool>{false});
 }
 
 TEST_F(CustomComboBoxTest, EnterPostsTheButtonEventToTheParent)

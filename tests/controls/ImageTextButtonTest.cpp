@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 #include <wx/frame.h>
 #include <wx/settings.h>
+#include <wx/uiaction.h>
 
 #include <memory>
 #include <vector>
@@ -273,17 +274,19 @@ TEST_F(ImageTextButtonTest, EachPressPostsOneClick)
 TEST_F(ImageTextButtonTest, ARealClickOnTheShownButtonReachesTheParent)
 {
     ImageTextButton* button = MakeButton(wxSize(115, 20), 6007);
-    button->SetText("Clear All");
+    button->SetText("Clear All ");
     frame->Show();
     guitest::Pump(100);
 
-    wxMouseEvent press(wxEVT_LEFT_DOWN);
-    press.SetPosition(wxPoint(50, 10));
-    press.SetEventObject(button);
-    button->HandleWindowEvent(press);
-    guitest::Pump(0);
+    wxUIActionSimulator input;
+    input.MouseMove(button->ClientToScreen(wxPoint(50, 10)));
+    guitest::Pump(20);
+    input.MouseClick();
+    for (int round = 0; round < 200 && clicks.empty(); ++round)
+        guitest::Pump(10);
 
     ASSERT_EQ(clicks.size(), 1u);
+    EXPECT_EQ(clicks[0].id, 6007);
     EXPECT_EQ(clicks[0].text, "Clear All");
 }
 
