@@ -29,11 +29,6 @@ constexpr int kLogChannel = 1;
 constexpr int kClearLockWaitMs = 2000;
 constexpr int kClearLockRetryMs = 10;
 
-bool IsFailedJob(const JobRecord& record)
-{
-    return !record[LogField::Status].IsSameAs("Transferred Successfully", false);
-}
-
 const std::locale& KeyFoldingLocale()
 {
     static const std::locale locale = []
@@ -50,6 +45,85 @@ const std::locale& KeyFoldingLocale()
     return locale;
 }
 
+// A fixed UTF-8 locale rather than the process's: texts must fold alike
+// whatever locale the program runs under ("C" folds only ASCII).
+const std::ctype<wchar_t>& Folding()
+{
+    static const std::ctype<wchar_t>& folding = std::use_facet<std::ctype<wchar_t>>(KeyFoldingLocale());
+    return folding;
+}
+
+void FoldInto(const wchar_t* text, std::size_t length, std::wstring& folded)
+{
+    folded.assign(text, length);
+    if (length != 0)
+        Folding().tolower(&folded[0], &folded[0] + length);
+}
+
+struct PieceSpan
+{
+    std::size_t start = 0;
+    std::size_t length = 0;
+};
+
+using LogPieces = std::array<PieceSpan, kLogLinePieces>;
+
+// Journal field order: key, hot folder, file, server, time, status, detail, tag.
+enum LogPiece : std::size_t
+{
+    KeyPiece = 0,
+    HotFolderPiece,
+    FilePiece,
+    ServerPiece,
+    DosTimePiece,
+    StatusPiece,
+    DetailPiece,
+    ActionPiece
+};
+
+// Splits on TAB, empty pieces dropped; false unless there are exactly eight.
+bool FindLogPieces(const wxString& line, LogPieces& pieces)
+{
+    std::size_t count = 0;
+    const std::size_t length = line.length();
+    std::size_t start = 0;
+    while (start < length)
+    {
+        std::size_t tab = line.find('\t', start);
+        if (tab == wxString::npos)
+            tab = length;
+        if (tab > start)
+        {
+            if (count == kLogLinePieces)
+                return false;
+            pieces[count++] = PieceSpan{start, tab - start};
+        }
+        start = tab + 1;
+    }
+    return count == kLogLinePieces;
+}
+
+wxString PieceText(const wxString& line, const PieceSpan& piece)
+{
+    return line.substr(piece.start, piece.length);
+}
+
+bool PieceIsNoCase(const wchar_t* line, const PieceSpan& piece, const std::wstring& text)
+{
+    if (piece.length != text.length())
+        return false;
+    const std::ctype<wchar_t>& folding = Folding();
+    for (std::size_t i = 0; i < piece.length; ++i)
+    {
+        if (folding.tolower(line[piece.start + i]) != folding.tolower(text[i]))
+            return false;
+    }
+    return true;
+}
+
+const std::wstring kSucceeded = L"Transferred Successfully";
+const std::wstring kAdded = L"ADDED";
+
 bool LockWithin(named_mutex_lock& lock, int milliseconds)
 {
     for (int waited = 0;; waited += kClearLockRetryMs)
@@ -64,48 +138,34 @@ bool LockWithin(named_mutex_lock& lock, int milliseconds)
 
 } // namespace
 
+struct JobLogManager::LineLayout
+{
+    std::size_t line = 0;
+    LogPieces pieces;
+    bool added = false;
+};
+
 bool SplitLogLine(const wxString& line, JobRecord& record, wxString& action)
 {
-    std::array<wxString, kLogLinePieces> pieces;
-    std::size_t count = 0;
-    const std::size_t length = line.length();
-    std::size_t start = 0;
-    while (start < length)
-    {
-        std::size_t tab = line.find('\t', start);
-        if (tab == wxString::npos)
-            tab = length;
-        if (tab > start)
-        {
-            if (count == kLogLinePieces)
-                return false;
-            pieces[count++] = line.substr(start, tab - start);
-        }
-        start = tab + 1;
-    }
-    if (count != kLogLinePieces)
+    LogPieces pieces;
+    if (!FindLogPieces(line, pieces))
         return false;
-
-    record[LogField::Key] = std::move(pieces[0]);
-    record[LogField::HotFolderPath] = std::move(pieces[1]);
-    record[LogField::FilePath] = std::move(pieces[2]);
-    record[LogField::Server] = std::move(pieces[3]);
-    record[LogField::DosTime] = std::move(pieces[4]);
-    record[LogField::Status] = std::move(pieces[5]);
-    record[LogField::Detail] = std::move(pieces[6]);
+    record[LogField::Key] = PieceText(line, pieces[KeyPiece]);
+    record[LogField::HotFolderPath] = PieceText(line, pieces[HotFolderPiece]);
+    record[LogField::FilePath] = PieceText(line, pieces[FilePiece]);
+    record[LogField::Server] = PieceText(line, pieces[ServerPiece]);
+    record[LogField::DosTime] = PieceText(line, pieces[DosTimePiece]);
+    record[LogField::Status] = PieceText(line, pieces[StatusPiece]);
+    record[LogField::Detail] = PieceText(line, pieces[DetailPiece]);
     record[LogField::TimeText].clear();
-    action = std::move(pieces[7]);
+    action = PieceText(line, pieces[ActionPiece]);
     return true;
 }
 
 std::wstring FoldedJobKey(const wxString& key)
 {
-    // A fixed UTF-8 locale rather than the process's: keys must fold alike
-    // whatever locale the program runs under ("C" folds only ASCII).
-    static const std::ctype<wchar_t>& folding = std::use_facet<std::ctype<wchar_t>>(KeyFoldingLocale());
-    std::wstring folded = key.ToStdWstring();
-    if (!folded.empty())
-        folding.tolower(&folded[0], &folded[0] + folded.size());
+    std::wstring folded;
+    FoldInto(key.wc_str(), key.length(), folded);
     return folded;
 }
 
@@ -161,19 +221,22 @@ int JobLogManager::Parse()
     bool firstRead = false;
     {
         std::lock_guard<std::mutex> guard(m_lock);
-        m_newRecords.clear();
+        m_newFirst = m_newEnd = m_firstSequence + m_records.size();
         clearGeneration = m_clearGeneration;
         firstRead = m_firstRead;
     }
     if (!m_running.load() || !m_reader)
         return 0;
 
-    std::vector<ReadLine> read;
+    wxArrayString lines;
     wyxos::FileStamp stamp;
-    if (!ReadChangedJournal(read, firstRead, stamp))
+    if (!ReadChangedJournal(lines, stamp))
         return 0;
+    std::vector<LineLayout> layouts;
+    std::vector<wxString> times;
+    LayOutLines(lines, firstRead, layouts, times);
     bool tookIn = false;
-    if (TakeIn(read, clearGeneration, tookIn))
+    if (TakeIn(lines, layouts, times, clearGeneration, tookIn))
         m_lastSeen = stamp;
     return tookIn && m_running.load() ? 1 : 0;
 }
@@ -181,7 +244,7 @@ int JobLogManager::Parse()
 // Reads the journal when it changed since the last read. Its stamp is stored as
 // seen only once the content behind it has been taken in, so a change that the
 // producer's lock kept us from reading is read at a later poll.
-bool JobLogManager::ReadChangedJournal(std::vector<ReadLine>& read, bool formatTimes, wyxos::FileStamp& stamp)
+bool JobLogManager::ReadChangedJournal(wxArrayString& lines, wyxos::FileStamp& stamp)
 {
     if (!wyxos::StatFile(m_journalPath).exists)
         return false;
@@ -196,7 +259,6 @@ bool JobLogManager::ReadChangedJournal(std::vector<ReadLine>& read, bool formatT
             return false;
     }
 
-    wxArrayString lines;
     const int result = m_reader->ReadJobs(lines);
     if (result == wyx::JobLockFailed)
         return false;
@@ -206,62 +268,85 @@ bool JobLogManager::ReadChangedJournal(std::vector<ReadLine>& read, bool formatT
         m_lastSeen = stamp;
         return false;
     }
+    return true;
+}
 
-    read.reserve(lines.size());
-    wxString action;
-    for (const wxString& line : lines)
+// Outside the lock: finds the pieces of every line, and on the first read, when
+// every line is taken in, formats the times as well.
+void JobLogManager::LayOutLines(const wxArrayString& lines, bool formatTimes,
+                                std::vector<LineLayout>& layouts, std::vector<wxString>& times) const
+{
+    layouts.reserve(lines.size());
+    for (std::size_t i = 0; i < lines.size(); ++i)
     {
         if (!m_running.load())
             break;
-        ReadLine parsed;
-        if (!SplitLogLine(line, parsed.record, action))
+        LineLayout layout;
+        layout.line = i;
+        if (!FindLogPieces(lines[i], layout.pieces))
             continue;
-        parsed.added = action.IsSameAs("ADDED", false);
+        layout.added = PieceIsNoCase(lines[i].wc_str(), layout.pieces[ActionPiece], kAdded);
         if (formatTimes)
-            parsed.record[LogField::TimeText] = FormatDosTime(parsed.record[LogField::DosTime]);
-        read.push_back(std::move(parsed));
+            times.push_back(FormatDosTime(PieceText(lines[i], layout.pieces[DosTimePiece])));
+        layouts.push_back(layout);
     }
-    return true;
 }
 
-bool JobLogManager::TakeIn(std::vector<ReadLine>& read, std::uint64_t clearGeneration, bool& tookIn)
+bool JobLogManager::TakeIn(const wxArrayString& lines, const std::vector<LineLayout>& layouts,
+                           std::vector<wxString>& times, std::uint64_t clearGeneration, bool& tookIn)
 {
+    std::lock_guard<std::mutex> guard(m_lock);
+    // Cleared while we read: what we read may be the journal before it was
+    // emptied. Leave the stamp as it was so the next poll reads the new one.
+    if (m_clearGeneration != clearGeneration)
+        return false;
+
+    m_newFirst = m_firstSequence + m_records.size();
+    if (m_firstRead)
+        m_keys.reserve(m_keys.size() + layouts.size());
+    std::wstring key;
+    std::wstring scratch;
+    for (std::size_t i = 0; i < layouts.size(); ++i)
     {
-        std::lock_guard<std::mutex> guard(m_lock);
-        // Cleared while we read: what we read may be the journal before it was
-        // emptied. Leave the stamp as it was so the next poll reads the new one.
-        if (m_clearGeneration != clearGeneration)
-            return false;
+        if (!m_running.load())
+            break;
+        const LineLayout& layout = layouts[i];
+        const wxString& line = lines[layout.line];
+        const wchar_t* text = line.wc_str();
+        const LogPieces& pieces = layout.pieces;
 
-        for (ReadLine& line : read)
-        {
-            if (!m_running.load())
-                break;
-            JobRecord& record = line.record;
-            NoteErrorFolder(record);
+        if (!PieceIsNoCase(text, pieces[StatusPiece], kSucceeded))
+            NoteErrorFolder(text + pieces[HotFolderPiece].start, pieces[HotFolderPiece].length, scratch);
 
-            std::wstring key = FoldedJobKey(record[LogField::Key]);
-            if (!m_firstRead && (!line.added || m_keys.count(key) != 0))
-                continue;
-            if (record[LogField::TimeText].empty())
-                record[LogField::TimeText] = FormatDosTime(record[LogField::DosTime]);
-            m_keys.insert(std::move(key));
-            m_newRecords.push_back(record);
-            m_records.push_back(std::move(record));
-            tookIn = true;
-        }
-        m_firstRead = false;
+        FoldInto(text + pieces[KeyPiece].start, pieces[KeyPiece].length, key);
+        if (!m_firstRead && (!layout.added || m_keys.count(key) != 0))
+            continue;
+        m_keys.insert(key);
+
+        JobRecord& record = m_records.emplace_back();
+        record[LogField::Key] = PieceText(line, pieces[KeyPiece]);
+        record[LogField::FilePath] = PieceText(line, pieces[FilePiece]);
+        record[LogField::HotFolderPath] = PieceText(line, pieces[HotFolderPiece]);
+        record[LogField::Server] = PieceText(line, pieces[ServerPiece]);
+        record[LogField::Status] = PieceText(line, pieces[StatusPiece]);
+        record[LogField::Detail] = PieceText(line, pieces[DetailPiece]);
+        record[LogField::DosTime] = PieceText(line, pieces[DosTimePiece]);
+        if (i < times.size())
+            record[LogField::TimeText].swap(times[i]);
+        else
+            record[LogField::TimeText] = FormatDosTime(record[LogField::DosTime]);
+        tookIn = true;
     }
+    m_newEnd = m_firstSequence + m_records.size();
+    m_firstRead = false;
     return true;
 }
 
-void JobLogManager::NoteErrorFolder(const JobRecord& record)
+void JobLogManager::NoteErrorFolder(const wchar_t* folder, std::size_t length, std::wstring& scratch)
 {
-    if (!IsFailedJob(record))
-        return;
-    const wxString& folder = record[LogField::HotFolderPath];
-    if (m_errorFolderSet.insert(folder.ToStdWstring()).second)
-        m_errorFolders.Add(folder);
+    scratch.assign(folder, length);
+    if (m_errorFolderSet.insert(scratch).second)
+        m_errorFolders.Add(wxString(folder, length));
 }
 
 std::size_t JobLogManager::GetRecordCount() const
@@ -280,7 +365,11 @@ int JobLogManager::GetAllRecords(std::vector<JobRecord>& records) const
 int JobLogManager::GetNewRecords(std::vector<JobRecord>& records) const
 {
     std::lock_guard<std::mutex> guard(m_lock);
-    records.insert(records.end(), m_newRecords.begin(), m_newRecords.end());
+    const std::uint64_t end = m_firstSequence + m_records.size();
+    const std::uint64_t from = std::min(std::max(m_newFirst, m_firstSequence), end);
+    const std::uint64_t to = std::min(std::max(m_newEnd, from), end);
+    records.insert(records.end(), m_records.begin() + static_cast<std::ptrdiff_t>(from - m_firstSequence),
+                   m_records.begin() + static_cast<std::ptrdiff_t>(to - m_firstSequence));
     return 0;
 }
 

@@ -2,6 +2,7 @@
 
 #include <atomic>
 #include <cstdint>
+#include <deque>
 #include <functional>
 #include <memory>
 #include <mutex>
@@ -55,7 +56,8 @@ public:
     int Parse();
 
     std::size_t GetRecordCount() const;
-    // Both append copies; GetNewRecords gives the records of the latest read only.
+    // Both append copies; GetNewRecords gives the records of the latest read
+    // that are still held (none once the log was cleared).
     int GetAllRecords(std::vector<JobRecord>& records) const;
     int GetNewRecords(std::vector<JobRecord>& records) const;
 
@@ -85,16 +87,15 @@ public:
     void SetIconRefreshSettingSource(std::function<wxString()> source);
 
 private:
-    struct ReadLine
-    {
-        JobRecord record;
-        bool added = false;
-    };
+    struct LineLayout;
 
-    bool ReadChangedJournal(std::vector<ReadLine>& read, bool formatTimes, wyxos::FileStamp& stamp);
+    bool ReadChangedJournal(wxArrayString& lines, wyxos::FileStamp& stamp);
+    void LayOutLines(const wxArrayString& lines, bool formatTimes, std::vector<LineLayout>& layouts,
+                     std::vector<wxString>& times) const;
     // False when the list was cleared meanwhile and what was read is dropped.
-    bool TakeIn(std::vector<ReadLine>& read, std::uint64_t clearGeneration, bool& tookIn);
-    void NoteErrorFolder(const JobRecord& record);
+    bool TakeIn(const wxArrayString& lines, const std::vector<LineLayout>& layouts,
+                std::vector<wxString>& times, std::uint64_t clearGeneration, bool& tookIn);
+    void NoteErrorFolder(const wchar_t* folder, std::size_t length, std::wstring& scratch);
     bool ReplaceJournalWithEmptyFile();
 
     const wxString m_journalPath;
@@ -108,10 +109,14 @@ private:
     wyxos::FileStamp m_lastSeen;
 
     mutable std::mutex m_lock;
-    std::vector<JobRecord> m_records;
+    // A deque, as wxString has no move: a growing vector would copy every record.
+    std::deque<JobRecord> m_records;
     std::unordered_set<std::wstring> m_keys;
-    std::vector<JobRecord> m_newRecords;
-    std::uint64_t m_firstSequence = 0; // sequence number of m_records.front()
+    // Records are numbered as taken in; numbers go on across ClearLog, so a
+    // view's cursor stays meaningful. The latest read's records are [newFirst, newEnd).
+    std::uint64_t m_firstSequence = 0; // number of m_records.front()
+    std::uint64_t m_newFirst = 0;
+    std::uint64_t m_newEnd = 0;
     std::uint64_t m_clearGeneration = 0;
     bool m_firstRead = true;
     wxArrayString m_errorFolders;

@@ -420,6 +420,14 @@ TEST_F(LogModel, ClearLogEmptiesListAndJournalAndForgetsKeys)
     EXPECT_EQ((std::vector<wxString>{"2"}), Keys(AllRecords(m_model)));
 }
 
+TEST_F(LogModel, NewRecordsOfAClearedLogAreGone)
+{
+    Write(LogLine("1", "ADDED"));
+    ASSERT_EQ(1, m_model.Parse());
+    ASSERT_EQ(0, m_model.ClearLog());
+    EXPECT_TRUE(NewRecords(m_model).empty());
+}
+
 TEST_F(LogModel, ClearLogLeavesTheJournalAloneWhileTheProducerHoldsItsLock)
 {
     Write(LogLine("1", "ADDED"));

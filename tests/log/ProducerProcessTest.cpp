@@ -1,0 +1,98 @@
+#include <atomic>
+#include <cstdlib>
+#include <map>
+#include <thread>
+
+#include <gtest/gtest.h>
+
+#include "LogTestSupport.h"
+#include "data/JobLogManager.h"
+#include "data/JobReadWriter.h"
+
+namespace
+{
+
+const auto* const g_wx = ::testing::AddGlobalTestEnvironment(new logtest::WxEnvironment);
+
+// The journal starts just below the producer's trimming point (10000 lines,
+// less the oldest 3000), so the appends below cross it.
+constexpr int kSeedLines = 9950;
+
+// Every append rereads and rewrites the whole journal in a new process, so a
+// run of 10,000 takes many minutes: WYX_LOG_PRODUCER_JOBS asks for it.
+int ProducerJobs()
+{
+    wxString value;
+    long jobs = 0;
+    if (wxGetEnv("WYX_LOG_PRODUCER_JOBS", &value) && value.ToLong(&jobs) && jobs > 0)
+        return static_cast<int>(jobs);
+    return WYX_LOG_PRODUCER_JOBS_DEFAULT;
+}
+
+std::size_t JournalLineCount(const wxString& path)
+{
+    wyx::JobsFileReadWriter journal;
+    journal.SetPath(path);
+    wxArrayString lines;
+    EXPECT_EQ(wyx::JobOk, journal.ReadJobs(lines));
+    return lines.size();
+}
+
+TEST(LogModelBesideAProducerProcess, ListsEveryJobExactlyOnceAcrossTrimming)
+{
+    logtest::SystemRoot root;
+    const int jobs = ProducerJobs();
+    ASSERT_GT(kSeedLines + jobs, 10000) << "the appends must cross the trimming point";
+
+    wxString seed;
+    for (int i = 0; i < kSeedLines; ++i)
+        seed += logtest::LogLine(wxString::Format("seed-%d", i), "ADDED");
+    logtest::SystemRoot::WriteFile(root.JournalPath(), seed);
+
+    JobLogManager model(root.JournalPath());
+    ASSERT_EQ(1, model.Parse());
+
+    // The producer: one wyx-journal process per finished job.
+    const wxString script = root.Path() + "/produce.sh";
+    logtest::SystemRoot::WriteFile(script,
+                                   "i=0\n"
+                                   "while [ \"$i\" -lt \"$2\" ]; do\n"
+                                   "  \"$1\" log add \"$(printf 'job-%d\\t/hf/In\\t/hf/In/%d.pdf\\tPRN-01\\t"
+                                   "1112223334\\tTransferred Successfully\\tok' \"$i\" \"$i\")\" || exit 1\n"
+                                   "  i=$((i + 1))\n"
+                                   "done\n");
+    const std::string command =
+        wxString::Format("sh '%s' '%s' %d", script, WYX_JOURNAL_TOOL, jobs).utf8_string();
+    std::atomic<bool> producing{true};
+    int producerStatus = -1;
+    std::thread producer(
+        [&]
+        {
+            producerStatus = std::system(command.c_str());
+            producing = false;
+        });
+    // The polling thread's part, driven here: poll until the producer is done.
+    while (producing)
+    {
+        model.Parse();
+        wxMilliSleep(1);
+    }
+    producer.join();
+    model.Parse();
+
+    ASSERT_EQ(0, producerStatus);
+    EXPECT_LT(JournalLineCount(root.JournalPath()), 10000u);
+
+    std::map<wxString, int> seen;
+    std::vector<JobRecord> records;
+    model.GetAllRecords(records);
+    for (const JobRecord& record : records)
+        ++seen[record[LogField::Key]];
+    EXPECT_EQ(static_cast<std::size_t>(kSeedLines + jobs), records.size());
+    for (int i = 0; i < kSeedLines; ++i)
+        EXPECT_EQ(1, seen[wxString::Format("seed-%d", i)]) << i;
+    for (int i = 0; i < jobs; ++i)
+        EXPECT_EQ(1, seen[wxString::Format("job-%d", i)]) << i;
+}
+
+} // namespace
