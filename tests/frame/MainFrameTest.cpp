@@ -6,6 +6,7 @@
 
 #include "ColourPrint.h"
 #include "GuiTest.h"
+#include "Settle.h"
 
 #include <gtest/gtest.h>
 #include <wx/dcmemory.h>
@@ -23,7 +24,12 @@ protected:
     {
         frame = new CMainFrame("WyxProgress Status & Log", wxDefaultPosition, wxSize(800, 600));
         frame->Show();
-        guitest::Pump();
+        ASSERT_TRUE(PumpUntil(
+            [this]
+            {
+                MainView* book = frame->GetNotebook();
+                return book->GetTabStrip()->GetSize().x == frame->GetClientSize().x;
+            }));
     }
 
     void TearDown() override
@@ -95,9 +101,13 @@ TEST_F(MainFrameTest, TheNotebookFillsTheClientAreaAndFollowsResizes)
     for (const wxSize& size : {wxSize(1000, 700), wxSize(640, 480)})
     {
         frame->SetSize(size);
-        frame->Layout();
-        guitest::Pump(20);
-        EXPECT_EQ(book->GetRect(), wxRect(wxPoint(0, 0), frame->GetClientSize())) << size.x << "x" << size.y;
+        // The window manager's answer comes as an event; the notebook must follow it.
+        EXPECT_TRUE(PumpUntil(
+            [&] {
+                return frame->GetSize() == size &&
+                       book->GetRect() == wxRect(wxPoint(0, 0), frame->GetClientSize());
+            }))
+            << size.x << "x" << size.y;
         const int strip = book->GetTabStripHeight();
         EXPECT_EQ(frame->GetStatusView()->GetRect(),
                   wxRect(0, strip, book->GetClientSize().x, book->GetClientSize().y - strip));

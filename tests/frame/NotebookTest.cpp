@@ -5,6 +5,7 @@
 
 #include "ColourPrint.h"
 #include "GuiTest.h"
+#include "Settle.h"
 
 #include <gtest/gtest.h>
 #include <wx/dcmemory.h>
@@ -60,7 +61,12 @@ protected:
         book->Bind(wxEVT_NOTEBOOK_PAGE_CHANGING, &NotebookTest::Record, this);
         book->Bind(wxEVT_NOTEBOOK_PAGE_CHANGED, &NotebookTest::Record, this);
         frame->Show();
-        guitest::Pump();
+        ASSERT_TRUE(PumpUntil(
+            [this]
+            {
+                return frame->GetClientSize().x > 100 && book->GetSize() == frame->GetClientSize() &&
+                       book->GetTabStrip()->GetSize().x == book->GetClientSize().x;
+            }));
     }
 
     void TearDown() override
@@ -301,7 +307,6 @@ TEST_F(NotebookTest, TheSelectedTabOpensOntoItsPage)
 TEST_F(NotebookTest, PagesFillTheAreaBelowTheStripAndFollowResizes)
 {
     book->SetSize(400, 250);
-    guitest::Pump(20);
     const int strip = book->GetTabStripHeight();
     EXPECT_EQ(book->GetTabStrip()->GetRect(), wxRect(0, 0, 400, strip));
     EXPECT_EQ(pages[0]->GetRect(), wxRect(0, strip, 400, 250 - strip));
