@@ -242,6 +242,11 @@ TEST_F(ErrorPanelTest, FirstWordWiderThanTheHeadingLineLeavesItEmpty)
     EXPECT_EQ(pixels::FirstDifference(Painted(size), expected), "");
 }
 
+TEST_F(ErrorPanelTest, RepaintsWhollyWhenResizedSoNarrowingRewraps)
+{
+    EXPECT_TRUE(panel->HasFlag(wxFULL_REPAINT_ON_RESIZE));
+}
+
 TEST_F(ErrorPanelTest, FillsTheWholeAreaWithItsBackground)
 {
     const wxSize size(300, 48);
