@@ -25,7 +25,9 @@ class TestNotebook : public CNOwnerDrawNotebook
 {
 public:
     wxSize extraPadding;
+    wxSize extraTabSize;
     wxRect pageInsets;
+    mutable std::vector<std::pair<size_t, wxRect>> decorated;
 
 protected:
     void SetupCustomInfo() override
@@ -36,6 +38,11 @@ protected:
     }
     wxSize GetExtraTabPadding() const override { return extraPadding; }
     wxRect GetPageInsets() const override { return pageInsets; }
+    wxSize AdjustTabSize(const wxSize& size) const override { return size + extraTabSize; }
+    void DrawTabDecoration(wxDC&, const wxRect& tabRect, size_t page) const override
+    {
+        decorated.emplace_back(page, tabRect);
+    }
 };
 
 struct PageEvent
@@ -331,6 +338,44 @@ TEST_F(NotebookTest, HooksChangeTheLayoutOnlyWhenTheyAnswerSomething)
     book->SetSize(400, 250);
     const wxRect page = book->GetPageRect();
     EXPECT_EQ(page, wxRect(3, stripBefore + 4, 400 - 3 - 5, 250 - stripBefore - 4 - 6));
+}
+
+TEST_F(NotebookTest, SizeAndDecorationHooksSeeEveryTab)
+{
+    const std::vector<wxRect> before = book->GetTabRects();
+    const int stripBefore = book->GetTabStripHeight();
+    book->extraTabSize = wxSize(7, 6);
+    const std::vector<wxRect> after = book->GetTabRects();
+    for (size_t i = 0; i < before.size(); ++i)
+        EXPECT_EQ(after[i].GetSize(), before[i].GetSize() + wxSize(7, 6));
+    EXPECT_EQ(book->GetTabStripHeight(), stripBefore + 6);
+
+    book->decorated.clear();
+    RenderStrip();
+    ASSERT_EQ(book->decorated.size(), 3u);
+    for (size_t i = 0; i < 3; ++i)
+    {
+        EXPECT_EQ(book->decorated[i].first, i);
+        EXPECT_EQ(book->decorated[i].second, after[i]);
+    }
+}
+
+TEST_F(NotebookTest, TheTabUnderThePointerIsDrawnInItsHoverColour)
+{
+    const std::vector<wxRect> tabs = book->GetTabRects();
+    const wxColour hover = book->GetCustomInfo().states[CNNotebookCustomInfo::Hover].fillColour;
+    ASSERT_NE(hover, kStrip);
+    ASSERT_NE(hover, kPage);
+
+    wxMouseEvent motion(wxEVT_MOTION);
+    motion.SetPosition(tabs[2].GetPosition() + wxPoint(2, tabs[2].height / 2));
+    book->GetTabStrip()->GetEventHandler()->ProcessEvent(motion);
+    EXPECT_EQ(Pixel(RenderStrip(), FillPoint(tabs[2])), hover);
+    EXPECT_EQ(Pixel(RenderStrip(), FillPoint(tabs[1])), kStrip);
+
+    wxMouseEvent leave(wxEVT_LEAVE_WINDOW);
+    book->GetTabStrip()->GetEventHandler()->ProcessEvent(leave);
+    EXPECT_EQ(Pixel(RenderStrip(), FillPoint(tabs[2])), kStrip);
 }
 
 TEST_F(NotebookTest, HitTestFindsTabsAndThePage)
