@@ -14,6 +14,31 @@ namespace
 
 const auto* const g_wx = ::testing::AddGlobalTestEnvironment(new logtest::WxEnvironment);
 
+// Runs before anything is loaded from a test file: the setting is then the
+// shipped file's "0", or "0" by default where there is none.
+TEST(IconRefreshSetting, WithoutAChoiceEachErrorFolderGetsItsIconRefreshed)
+{
+    logtest::SystemRoot root;
+    const wxArrayString folders = root.MakeHotFolders(logtest::Strings({"In", "Out", "Proofs"}));
+    logtest::SystemRoot::WriteFile(root.JournalPath(),
+                                   logtest::LogLine("1", "ADDED", "Failed", folders[2]) +
+                                       logtest::LogLine("2", "ADDED", "Failed", folders[0]));
+    EXPECT_EQ("0", ReadIconRefreshSetting());
+
+    wyxos::ResetShellNotifications();
+    const std::size_t iconCalls = WyxDataSource::GetInstance().GetIconChanges().size();
+    JobLogManager model(root.JournalPath());
+    ASSERT_EQ(1, model.Parse());
+    model.ClearLog();
+
+    const std::vector<WyxDataSource::IconChange> calls = WyxDataSource::GetInstance().GetIconChanges();
+    ASSERT_EQ(iconCalls + 2, calls.size());
+    EXPECT_EQ(folders[2], calls[iconCalls].hotFolderPath);
+    EXPECT_EQ(folders[0], calls[iconCalls + 1].hotFolderPath);
+    EXPECT_EQ(0u, wyxos::ShellNotificationCount());
+    EXPECT_TRUE(model.GetErrorFolders().empty());
+}
+
 TEST(IconRefreshSetting, ComesFromTheConfigurationOnEveryUse)
 {
     logtest::SystemRoot root;

@@ -1,3 +1,5 @@
+#include <condition_variable>
+#include <mutex>
 #include <set>
 #include <thread>
 
@@ -477,6 +479,57 @@ TEST_F(LogModel, LinesReadBeforeAClearDoNotComeBack)
 }
 
 // --- threads ----------------------------------------------------------------
+
+TEST_F(LogModel, ClearLogBesideAnAppendingProducerKeepsEveryLaterLineAndNoEarlierOne)
+{
+    constexpr int kJobs = 200;
+    Write("");
+    ASSERT_EQ(0, m_model.Parse());
+
+    std::mutex halfwayLock;
+    std::condition_variable halfwayReached;
+    bool halfway = false;
+    std::thread producer(
+        [&]
+        {
+            wyx::JobsFileReadWriter journal;
+            journal.SetPath(m_root.JournalPath());
+            for (int i = 0; i < kJobs; ++i)
+            {
+                wxString line = logtest::LogFields(wxString::Format("job-%d", i));
+                EXPECT_EQ(wyx::JobOk, journal.AddJob(line)) << i;
+                if (i == kJobs / 2)
+                {
+                    std::lock_guard<std::mutex> guard(halfwayLock);
+                    halfway = true;
+                    halfwayReached.notify_one();
+                }
+            }
+        });
+    {
+        std::unique_lock<std::mutex> guard(halfwayLock);
+        halfwayReached.wait(guard, [&] { return halfway; });
+    }
+    EXPECT_EQ(0, m_model.ClearLog());
+    producer.join();
+    m_model.Parse();
+
+    // Each append happened wholly before the clear (and is gone) or wholly
+    // after it: the journal holds an unbroken run of the last jobs, nothing older.
+    wyx::JobsFileReadWriter journal;
+    journal.SetPath(m_root.JournalPath());
+    wxArrayString lines;
+    ASSERT_EQ(wyx::JobOk, journal.ReadJobs(lines));
+    ASSERT_LT(lines.size(), static_cast<std::size_t>(kJobs / 2));
+    const int first = kJobs - static_cast<int>(lines.size());
+    std::vector<wxString> expected;
+    for (int i = 0; i < static_cast<int>(lines.size()); ++i)
+    {
+        EXPECT_TRUE(lines[i].StartsWith(wxString::Format("job-%d\t", first + i))) << lines[i];
+        expected.push_back(wxString::Format("job-%d", first + i));
+    }
+    EXPECT_EQ(expected, Keys(AllRecords(m_model)));
+}
 
 TEST_F(LogModel, PollerProducerAndViewTogetherLoseAndRepeatNothing)
 {
