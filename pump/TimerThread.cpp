@@ -24,8 +24,10 @@ wxThread::ExitCode TimerThread::Entry()
     {
         m_owner->Notify();
         std::unique_lock<std::mutex> lock(m_sleepLock);
+        m_asleep = true;
         m_wakeUp.wait_for(lock, std::chrono::milliseconds(m_interval.load()),
                           [this] { return m_stop.load(); });
+        m_asleep = false;
     }
     return static_cast<ExitCode>(nullptr);
 }

@@ -24,6 +24,8 @@ public:
 
     void RequestStop();
     bool IsStopRequested() const { return m_stop; }
+    // True while the thread waits between two passes.
+    bool IsAsleep() const { return m_asleep; }
 
 protected:
     ExitCode Entry() override;
@@ -32,6 +34,7 @@ private:
     INotify* m_owner;
     std::atomic<int> m_interval{kInitialIntervalMs};
     std::atomic<bool> m_stop{false};
+    std::atomic<bool> m_asleep{false};
     std::mutex m_sleepLock;
     std::condition_variable m_wakeUp;
 };

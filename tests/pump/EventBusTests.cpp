@@ -40,9 +40,10 @@ private:
     std::vector<int>& m_trace;
 };
 
+// The tests run a console application; wxTheApp would take it for a GUI one.
 void DeliverPendingEvents()
 {
-    wxTheApp->ProcessPendingEvents();
+    wxAppConsole::GetInstance()->ProcessPendingEvents();
 }
 
 wxCommandEvent StatusUpdate()

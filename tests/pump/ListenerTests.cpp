@@ -2,6 +2,7 @@
 #include <condition_variable>
 #include <mutex>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -285,6 +286,10 @@ TEST(PollingThread, ThreadStartsWithTheLongIntervalAndStopsWhileAsleep)
     ASSERT_EQ(thread.Create(), wxTHREAD_NO_ERROR);
     ASSERT_EQ(thread.Run(), wxTHREAD_NO_ERROR);
     listener.WaitForPasses(1);
+    // The flag is set under the lock the sleep releases: once it shows, the
+    // stop request below can only arrive while the thread waits.
+    while (!thread.IsAsleep())
+        std::this_thread::yield();
     thread.RequestStop();
     thread.Wait();
     EXPECT_EQ(listener.Passes(), 1);
