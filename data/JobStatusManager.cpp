@@ -1,0 +1,125 @@
+#include "data/JobStatusManager.h"
+
+#include <wx/event.h>
+#include <wx/filename.h>
+
+#include "data/DataLocations.h"
+#include "data/JobReadWriter.h"
+#include "data/NamedMutex.h"
+#include "data/StatusLine.h"
+#include "platform/datasource/WyxDataSource.h"
+#include "pump/CustomEvents.h"
+#include "pump/EventBus.h"
+
+namespace
+{
+
+constexpr int kStatusChannel = 2;
+
+std::unique_ptr<wyx::IJobReadWriter> MakeFileReader(const wxString& path, const std::atomic<bool>& running)
+{
+    std::unique_ptr<wyx::IJobReadWriter> reader(CreateJobReadWriter(kJobsFileReadWriterKind));
+    if (auto* file = dynamic_cast<wyx::JobsFileReadWriter*>(reader.get()))
+    {
+        file->SetPath(path);
+        file->SetKeepWaiting(&running);
+    }
+    return reader;
+}
+
+} // namespace
+
+JobStatusManager& JobStatusManager::GetInstance()
+{
+    static JobStatusManager instance(GetDataDirectory() + "TiveraJobsStatusFile.txt");
+    return instance;
+}
+
+JobStatusManager::JobStatusManager(const wxString& journalPath, std::unique_ptr<wyx::IJobReadWriter> reader)
+    : m_journalPath(journalPath), m_lockName(wxFileName(journalPath).GetName()),
+      m_reader(reader ? std::move(reader) : MakeFileReader(journalPath, m_running))
+{
+}
+
+JobStatusManager::~JobStatusManager()
+{
+    std::lock_guard<std::mutex> guard(m_lock);
+    m_jobs.clear();
+}
+
+void JobStatusManager::SetRunning(bool running)
+{
+    m_running = running;
+}
+
+JobStatusManager::ReadOutcome JobStatusManager::ReadChangedJournal(wxArrayString& lines)
+{
+    if (!m_reader || !wyxos::StatFile(m_journalPath).exists)
+        return ReadOutcome::Unchanged;
+
+    wyxos::FileStamp stamp;
+    {
+        // The producer holds the lock while it writes: a stamp taken under it
+        // is the stamp of a whole file.
+        named_mutex_lock lock(m_lockName);
+        if (!lock.try_lock())
+            return ReadOutcome::Unchanged;
+        stamp = wyxos::StatFile(m_journalPath);
+        if (stamp == m_lastSeen)
+            return ReadOutcome::Unchanged;
+    }
+
+    // A write between the check and the read only makes the next poll read once
+    // more: the stamp kept is never newer than the content read.
+    const int result = m_reader->ReadJobs(lines);
+    if (result == wyx::JobLockFailed)
+        return ReadOutcome::Unchanged;
+    m_lastSeen = stamp;
+    return result == wyx::JobOk ? ReadOutcome::Read : ReadOutcome::Unreadable;
+}
+
+int JobStatusManager::Parse()
+{
+    std::lock_guard<std::mutex> parseGuard(m_parseLock);
+    wxArrayString lines;
+    if (ReadChangedJournal(lines) != ReadOutcome::Read)
+        return 0;
+
+    std::vector<JobRecord> jobs;
+    jobs.reserve(lines.size());
+    JobRecord record;
+    for (const wxString& line : lines)
+    {
+        if (!m_running)
+            break;
+        if (ParseStatusLine(line, record))
+            jobs.push_back(record);
+    }
+
+    {
+        std::lock_guard<std::mutex> guard(m_lock);
+        m_jobs.swap(jobs);
+    }
+    return 1;
+}
+
+int JobStatusManager::Refresh()
+{
+    if (Parse() != 1)
+        return 0;
+    wxCommandEvent event(wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS, 0);
+    EventBus::Get().Publish(ChannelKey(kStatusChannel), event);
+    return 1;
+}
+
+int JobStatusManager::GetJobs(std::vector<JobRecord>& jobs) const
+{
+    std::lock_guard<std::mutex> guard(m_lock);
+    jobs.insert(jobs.end(), m_jobs.begin(), m_jobs.end());
+    return 0;
+}
+
+long JobStatusManager::GetServers(wxArrayString& names) const
+{
+    return WyxDataSource::GetInstance().GetServersList(names);
+}

@@ -1,0 +1,77 @@
+#pragma once
+
+#include <atomic>
+#include <memory>
+#include <mutex>
+#include <vector>
+
+#include <wx/arrstr.h>
+#include <wx/string.h>
+
+#include "data/JobRecord.h"
+#include "platform/os/FileStamp.h"
+
+namespace wyx
+{
+class IJobReadWriter;
+}
+
+// The jobs in progress, as the status journal lists them. The polling thread
+// calls Refresh once a second; a changed journal is read whole, its shown lines
+// replace the list and the status views are told on bus channel 2.
+//
+// Refresh and Parse run on the polling thread, one call at a time; GetJobs and
+// GetServers on the GUI thread. The list is guarded by one mutex, held only
+// while it is swapped or copied; the journal is read outside it.
+class JobStatusManager
+{
+public:
+    static JobStatusManager& GetInstance();
+
+    // reader: how the journal is read; null gives a JobsFileReadWriter on journalPath.
+    explicit JobStatusManager(const wxString& journalPath,
+                              std::unique_ptr<wyx::IJobReadWriter> reader = nullptr);
+    virtual ~JobStatusManager();
+
+    JobStatusManager(const JobStatusManager&) = delete;
+    JobStatusManager& operator=(const JobStatusManager&) = delete;
+
+    // 1 when the list was replaced and the views were told, else 0.
+    int Refresh();
+    // 1 when the list was replaced (also by an equal one), else 0.
+    int Parse();
+
+    // Appends a copy of every job in journal order; returns 0.
+    int GetJobs(std::vector<JobRecord>& jobs) const;
+    // The configured print servers, from the data source.
+    long GetServers(wxArrayString& names) const;
+
+    // False makes a read under way stop at the next line and keep what it has,
+    // and gives up waiting for the journal's lock.
+    void SetRunning(bool running);
+
+    const wxString& GetJournalPath() const { return m_journalPath; }
+
+private:
+    enum class ReadOutcome
+    {
+        Unchanged,  // missing, unchanged, or its lock is held: look again next time
+        Unreadable, // changed but could not be read: wait for the next change
+        Read
+    };
+
+    ReadOutcome ReadChangedJournal(wxArrayString& lines);
+
+    const wxString m_journalPath;
+    const wxString m_lockName;
+    std::atomic<bool> m_running{true};
+    std::unique_ptr<wyx::IJobReadWriter> m_reader;
+
+    // Polling thread only. No stamp at first, so an existing journal is read at
+    // the first poll whenever it was written.
+    std::mutex m_parseLock;
+    wyxos::FileStamp m_lastSeen;
+
+    mutable std::mutex m_lock;
+    std::vector<JobRecord> m_jobs;
+};
