@@ -1,0 +1,60 @@
+#include <csignal>
+#include <cstdio>
+
+#include <wx/init.h>
+
+#include "tools/simulator/HotFolderSimulator.h"
+#include "tools/simulator/SimulatorOptions.h"
+
+namespace
+{
+
+volatile std::sig_atomic_t g_stopRequested = 0;
+
+extern "C" void RequestStop(int)
+{
+    g_stopRequested = 1;
+}
+
+} // namespace
+
+int main(int argc, char** argv)
+{
+    wxInitializer initializer(argc, argv);
+    if (!initializer.IsOk())
+        return 1;
+
+    SimulatorOptions options;
+    wxString problem;
+    if (!ParseSimulatorOptions(argc, argv, options, problem))
+    {
+        std::fprintf(stderr, "wyx-simulator: %s\n\n%s", static_cast<const char*>(problem.utf8_str()),
+                     kSimulatorUsage);
+        return 2;
+    }
+    if (options.help)
+    {
+        std::fputs(kSimulatorUsage, stdout);
+        return 0;
+    }
+
+    std::signal(SIGTERM, RequestStop);
+    std::signal(SIGINT, RequestStop);
+
+    HotFolderSimulator simulator(options, [] { return g_stopRequested != 0; });
+    if (!simulator.Prepare(problem))
+    {
+        std::fprintf(stderr, "wyx-simulator: %s\n", static_cast<const char*>(problem.utf8_str()));
+        return 1;
+    }
+    std::printf("wyx-simulator: writing to %s\n",
+                static_cast<const char*>(simulator.DataDirectory().utf8_str()));
+    std::fflush(stdout);
+
+    const HotFolderSimulator::Totals totals = simulator.Run();
+    std::printf("wyx-simulator: %u jobs started, %u transferred, %u failed%s\n", totals.started,
+                totals.succeeded, totals.failed, g_stopRequested ? " (stopped)" : "");
+    if (totals.journalErrors > 0)
+        std::fprintf(stderr, "wyx-simulator: %u journal operations failed\n", totals.journalErrors);
+    return 0;
+}
