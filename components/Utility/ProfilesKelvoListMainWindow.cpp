@@ -455,6 +455,9 @@ void ProfilesKelvoListMainWindow::ClampScrollPosition()
 
 void ProfilesKelvoListMainWindow::MarkDirty()
 {
+    // One refresh per layout: bulk inserts would otherwise invalidate per row.
+    if (m_dirty)
+        return;
     m_dirty = true;
     Refresh();
 }
@@ -505,6 +508,9 @@ void ProfilesKelvoListMainWindow::RefreshLine(long item)
 
 void ProfilesKelvoListMainWindow::RefreshLines(long from, long to)
 {
+    // A pending layout repaints everything anyway.
+    if (m_dirty)
+        return;
     if (from > to)
         std::swap(from, to);
     const long last = GetLastVisibleItem();

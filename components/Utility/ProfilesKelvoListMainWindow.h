@@ -2,6 +2,7 @@
 
 #include "components/Utility/ProfilesKelvoListLineData.h"
 #include "components/Utility/ProfilesKelvoListSelection.h"
+#include "components/Utility/ProfilesKelvoListTextCache.h"
 
 #include <wx/brush.h>
 #include <wx/event.h>
@@ -155,8 +156,9 @@ private:
     wxImageList* m_smallImages = nullptr;
     wxImageList* m_stateImages = nullptr;
     wxImageList* m_headerImages = nullptr;
-    mutable long m_lastHintFrom = -1;
-    mutable long m_lastHintTo = -1;
+    long m_lastHintFrom = -1;
+    long m_lastHintTo = -1;
+    mutable ProfilesKelvoListTextCache m_textCache;
 
     wxDECLARE_EVENT_TABLE();
 };

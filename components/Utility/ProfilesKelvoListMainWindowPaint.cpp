@@ -20,9 +20,9 @@ constexpr int kStatusSquareSize = 16;
 } // namespace
 
 void DrawListCellText(wxDC& dc, const wxString& text, int format, int x, int yMiddle, int width,
-                      bool hasImage)
+                      bool hasImage, ProfilesKelvoListTextCache* cache)
 {
-    const wxSize extent = dc.GetTextExtent(text);
+    const wxSize extent = cache ? cache->Extent(dc, text) : dc.GetTextExtent(text);
     const int y = yMiddle - (extent.GetHeight() + 1) / 2;
     const wxRect box(x, y, width, extent.GetHeight());
 
@@ -190,7 +190,7 @@ void ProfilesKelvoListMainWindow::DrawRow(wxDC& dc, long item, const wxRect& row
         if (ownFont)
             dc.SetFont(attr.font);
         DrawListCellText(dc, cell.text, column.format, textX, yMiddle, textWidth - kCellTextMargin,
-                         cell.image != kCellImageNone);
+                         cell.image != kCellImageNone, ownFont ? nullptr : &m_textCache);
         if (ownFont)
             dc.SetFont(GetFont());
     }

@@ -260,11 +260,10 @@ TEST_F(ListPaint, TextIsShortenedExactlyWhenWiderThanTheColumnLessEight)
         const wxImage image = RenderRows(list);
         const int lh = list->GetMainWindow()->GetLineHeight();
         const bool shortened = spare < 0;
-        EXPECT_TRUE(SameCell(image, ReferenceCell(list, text, textWidth + spare, shortened), columnWidth, lh))
-            << "spare " << spare;
-        EXPECT_FALSE(
-            SameCell(image, ReferenceCell(list, text, textWidth + spare, !shortened), columnWidth, lh))
-            << "spare " << spare;
+        const wxImage whole = ReferenceCell(list, text, textWidth, false);
+        const wxImage cut = ReferenceCell(list, text, textWidth - 1, true);
+        EXPECT_TRUE(SameCell(image, shortened ? cut : whole, columnWidth, lh)) << "spare " << spare;
+        EXPECT_FALSE(SameCell(image, shortened ? whole : cut, columnWidth, lh)) << "spare " << spare;
         m_frame->Destroy();
         m_frame = nullptr;
     }
