@@ -22,7 +22,6 @@ const wxString kLogJournalMarker = "TiveraJobsLogFile";
 
 enum class Access
 {
-    Read,
     Write,
     // Writes without keeping anything read, so any journal can be emptied.
     Overwrite
@@ -46,90 +45,110 @@ bool HasKey(const JournalLine& line, const wxString& key)
     return !key.empty() && TrimmedKey(line.text) == key;
 }
 
-// One atomic read-modify-write of the whole journal under its named lock.
-int RunLocked(const wxString& path, const std::atomic<bool>* keepWaiting, Access access, const LineEdit& edit)
+// A journal under its named lock, held from the first read until destruction.
+class LockedJournal
+{
+public:
+    explicit LockedJournal(const wxString& path) : m_path(path), m_lock(wxFileName(path).GetName()) {}
+
+    int Read(const std::atomic<bool>* keepWaiting, std::string& bytes)
+    {
+        if (!m_lock.lock(keepWaiting))
+            return JobLockFailed;
+        return wyxos::ReadFileContents(m_path, bytes) == wyxos::ReadResult::Read ? JobOk : JobFileMissing;
+    }
+
+    int Replace(const std::vector<JournalLine>& lines)
+    {
+        return wyxos::ReplaceFileContents(m_path, EncodeJournal(lines)) ? JobOk : JobWriteFailed;
+    }
+
+private:
+    wxString m_path;
+    named_mutex_lock m_lock;
+};
+
+// One atomic read-modify-write of the whole journal.
+int EditLocked(const wxString& path, const std::atomic<bool>* keepWaiting, Access access,
+               const LineEdit& edit)
 {
     if (path.empty())
         return JobOk;
-
-    named_mutex_lock lock(wxFileName(path).GetName());
-    if (!lock.lock(keepWaiting))
-        return JobLockFailed;
-
+    LockedJournal locked(path);
     std::string bytes;
-    if (wyxos::ReadFileContents(path, bytes) != wyxos::ReadResult::Read)
-        return JobFileMissing;
+    const int read = locked.Read(keepWaiting, bytes);
+    if (read != JobOk)
+        return read;
+
     DecodedJournal journal = DecodeJournal(bytes.data(), bytes.size());
     // Rewriting a journal that could not be decoded in full would destroy the
     // undecodable part; readers still get the lines with replacements.
     if (access == Access::Write && !journal.exact)
         return JobFileMissing;
-
     if (!edit(journal.lines))
         return JobOk;
-    return wyxos::ReplaceFileContents(path, EncodeJournal(journal.lines)) ? JobOk : JobWriteFailed;
+    return locked.Replace(journal.lines);
 }
 
 } // namespace
 
 int JobsFileReadWriter::ReadJobs(wxArrayString& lines)
 {
-    return RunLocked(m_path, m_keepWaiting, Access::Read,
-                     [&lines](std::vector<JournalLine>& journal)
-                     {
-                         lines.Clear();
-                         lines.reserve(journal.size());
-                         for (const JournalLine& line : journal)
-                             lines.Add(line.text);
-                         return false;
-                     });
+    if (m_path.empty())
+        return JobOk;
+    LockedJournal locked(m_path);
+    std::string bytes;
+    const int read = locked.Read(m_keepWaiting, bytes);
+    if (read == JobOk)
+        DecodeJournalTexts(bytes.data(), bytes.size(), lines);
+    return read;
 }
 
 int JobsFileReadWriter::AddJob(wxString& line)
 {
     const bool trims = m_path.Contains(kLogJournalMarker);
-    return RunLocked(m_path, m_keepWaiting, Access::Write,
-                     [&line, trims](std::vector<JournalLine>& journal)
-                     {
-                         if (line.empty())
-                             return false;
-                         line += "\tADDED";
-                         if (trims && journal.size() >= kLogTrimThreshold)
-                             journal.erase(journal.begin(), journal.begin() + kLogTrimCount);
-                         // A last line without a line break would otherwise run into the new one.
-                         if (!journal.empty() && journal.back().end == LineEnd::None)
-                             journal.back().end = LineEnd::CrLf;
-                         journal.push_back(JournalLine{line, LineEnd::CrLf});
-                         return true;
-                     });
+    return EditLocked(m_path, m_keepWaiting, Access::Write,
+                      [&line, trims](std::vector<JournalLine>& journal)
+                      {
+                          if (line.empty())
+                              return false;
+                          line += "\tADDED";
+                          if (trims && journal.size() >= kLogTrimThreshold)
+                              journal.erase(journal.begin(), journal.begin() + kLogTrimCount);
+                          // A last line without a line break would otherwise run into the new one.
+                          if (!journal.empty() && journal.back().end == LineEnd::None)
+                              journal.back().end = LineEnd::CrLf;
+                          journal.push_back(JournalLine{line, LineEnd::CrLf});
+                          return true;
+                      });
 }
 
 int JobsFileReadWriter::ModifyJob(wxString line)
 {
     const wxString key = TrimmedKey(line);
     const wxString replacement = line + "\tMODIFIED";
-    return RunLocked(m_path, m_keepWaiting, Access::Write,
-                     [&key, &replacement](std::vector<JournalLine>& journal)
-                     {
-                         for (JournalLine& existing : journal)
-                             if (HasKey(existing, key))
-                                 existing.text = replacement;
-                         return true;
-                     });
+    return EditLocked(m_path, m_keepWaiting, Access::Write,
+                      [&key, &replacement](std::vector<JournalLine>& journal)
+                      {
+                          for (JournalLine& existing : journal)
+                              if (HasKey(existing, key))
+                                  existing.text = replacement;
+                          return true;
+                      });
 }
 
 int JobsFileReadWriter::DeleteJob(wxString key)
 {
     key.Trim(true);
-    return RunLocked(m_path, m_keepWaiting, Access::Write,
-                     [&key](std::vector<JournalLine>& journal)
-                     {
-                         journal.erase(std::remove_if(journal.begin(), journal.end(),
-                                                      [&key](const JournalLine& line)
-                                                      { return HasKey(line, key); }),
-                                       journal.end());
-                         return true;
-                     });
+    return EditLocked(m_path, m_keepWaiting, Access::Write,
+                      [&key](std::vector<JournalLine>& journal)
+                      {
+                          journal.erase(std::remove_if(journal.begin(), journal.end(),
+                                                       [&key](const JournalLine& line)
+                                                       { return HasKey(line, key); }),
+                                        journal.end());
+                          return true;
+                      });
 }
 
 int JobsFileReadWriter::RemoveJob(wxString key)
@@ -139,33 +158,33 @@ int JobsFileReadWriter::RemoveJob(wxString key)
 
 int JobsFileReadWriter::ClearJobs()
 {
-    return RunLocked(m_path, m_keepWaiting, Access::Overwrite,
-                     [](std::vector<JournalLine>& journal)
-                     {
-                         journal.clear();
-                         return true;
-                     });
+    return EditLocked(m_path, m_keepWaiting, Access::Overwrite,
+                      [](std::vector<JournalLine>& journal)
+                      {
+                          journal.clear();
+                          return true;
+                      });
 }
 
 int JobsFileReadWriter::CommitJob(wxString key)
 {
     key.Trim(true);
-    return RunLocked(m_path, m_keepWaiting, Access::Write,
-                     [&key](std::vector<JournalLine>& journal)
-                     {
-                         if (journal.empty())
-                             return false;
-                         for (JournalLine& line : journal)
-                         {
-                             if (!HasKey(line, key) || line.text.Contains("DELETE"))
-                                 continue;
-                             // A line of one field has no tag to replace; its key is kept.
-                             const wxString fields =
-                                 line.text.Contains("\t") ? line.text.BeforeLast('\t') : line.text;
-                             line.text = fields + "\tCOMMIT";
-                         }
-                         return true;
-                     });
+    return EditLocked(m_path, m_keepWaiting, Access::Write,
+                      [&key](std::vector<JournalLine>& journal)
+                      {
+                          if (journal.empty())
+                              return false;
+                          for (JournalLine& line : journal)
+                          {
+                              if (!HasKey(line, key) || line.text.Contains("DELETE"))
+                                  continue;
+                              // A line of one field has no tag to replace; its key is kept.
+                              const wxString fields =
+                                  line.text.Contains("\t") ? line.text.BeforeLast('\t') : line.text;
+                              line.text = fields + "\tCOMMIT";
+                          }
+                          return true;
+                      });
 }
 
 } // namespace wyx

@@ -34,7 +34,7 @@ wxUint32 ReadUnit(const unsigned char* at, std::size_t width, bool bigEndian)
 
 // UTF-16 or UTF-32 that the library refused (an odd trailing byte, a lone
 // surrogate, a value beyond U+10FFFF): every bad unit becomes U+FFFD.
-wxString DecodeWideLeniently(const unsigned char* data, std::size_t size, wxBOM bom)
+std::wstring DecodeWideLeniently(const unsigned char* data, std::size_t size, wxBOM bom)
 {
     const bool wide32 = bom == wxBOM_UTF32BE || bom == wxBOM_UTF32LE;
     const bool bigEndian = bom == wxBOM_UTF32BE || bom == wxBOM_UTF16BE;
@@ -59,33 +59,50 @@ wxString DecodeWideLeniently(const unsigned char* data, std::size_t size, wxBOM 
     }
     if (at < size)
         text.push_back(static_cast<wchar_t>(kReplacement));
-    return wxString(text);
+    return text;
+}
+
+std::wstring DecodeSingleByte(const char* bytes, std::size_t size)
+{
+    std::wstring text(size, L'\0');
+    for (std::size_t at = 0; at < size; ++at)
+        text[at] = static_cast<wchar_t>(static_cast<unsigned char>(bytes[at]));
+    return text;
+}
+
+// The library's automatic conversion straight into one buffer: journals of
+// 100000 lines make every extra copy of the whole text count.
+bool DecodeAutomatically(const char* bytes, std::size_t size, std::wstring& text)
+{
+    wxConvAuto automatic;
+    const std::size_t length = automatic.ToWChar(nullptr, 0, bytes, size);
+    if (length == wxCONV_FAILED)
+        return false;
+    text.assign(length, L'\0');
+    return length == 0 || automatic.ToWChar(&text[0], length, bytes, size) == length;
 }
 
 // Decodes the whole file to one text; exact is cleared when bytes were lost.
-wxString DecodeText(const char* bytes, std::size_t size, bool& exact)
+std::wstring DecodeText(const char* bytes, std::size_t size, bool& exact)
 {
     exact = true;
     if (size == 0)
-        return wxString();
+        return std::wstring();
 
-    wxConvAuto automatic;
-    wxString text(bytes, automatic, size);
     const wxBOM bom = wxConvAuto::DetectBOM(bytes, size);
-    if (!text.empty() || size == BomLength(bom))
+    if (size == BomLength(bom))
+        return std::wstring();
+    std::wstring text;
+    if (DecodeAutomatically(bytes, size, text) && !text.empty())
     {
         // The library passes UTF-32 values that are no characters through.
-        const wchar_t* const data = text.wc_str();
-        std::wstring checked;
-        for (std::size_t at = 0, length = text.length(); at < length; ++at)
-            if (!IsScalarValue(static_cast<wxUint32>(data[at])))
+        for (wchar_t& c : text)
+            if (!IsScalarValue(static_cast<wxUint32>(c)))
             {
-                if (exact)
-                    checked.assign(data, length);
-                checked[at] = static_cast<wchar_t>(kReplacement);
+                c = static_cast<wchar_t>(kReplacement);
                 exact = false;
             }
-        return exact ? text : wxString(checked);
+        return text;
     }
 
     const std::size_t skip = BomLength(bom);
@@ -99,10 +116,10 @@ wxString DecodeText(const char* bytes, std::size_t size, bool& exact)
         return DecodeWideLeniently(reinterpret_cast<const unsigned char*>(bytes) + skip, size - skip, bom);
     case wxBOM_UTF8:
         exact = false;
-        return wxString(bytes + skip, wxConvISO8859_1, size - skip);
+        return DecodeSingleByte(bytes + skip, size - skip);
     default:
         // Too short to tell a mark from text ("\xFF" alone): the fallback.
-        return wxString(bytes, wxConvISO8859_1, size);
+        return DecodeSingleByte(bytes, size);
     }
 }
 
@@ -150,38 +167,66 @@ const char* LineEndBytes(LineEnd end)
     return "";
 }
 
+std::size_t CountLineBreaks(const std::wstring& text)
+{
+    std::size_t breaks = 0;
+    for (wchar_t c : text)
+        breaks += c == L'\n' || c == L'\r';
+    return breaks;
+}
+
+// Calls add(text, length, end) for each line of the decoded text.
+template <typename Add> void SplitLines(const std::wstring& text, Add add)
+{
+    const wchar_t* const data = text.data();
+    const std::size_t length = text.length();
+
+    // A second mark after the first (a mark written twice) is no text: kept,
+    // it would turn into the mark of the UTF-8 rewrite and vanish only then.
+    std::size_t start = 0;
+    while (start < length && data[start] == L'\uFEFF')
+        ++start;
+    for (std::size_t at = start; at < length; ++at)
+    {
+        const wchar_t c = data[at];
+        if (c != L'\r' && c != L'\n')
+            continue;
+        LineEnd end = c == L'\r' ? LineEnd::Cr : LineEnd::Lf;
+        const std::size_t lineLength = at - start;
+        if (c == L'\r' && at + 1 < length && data[at + 1] == L'\n')
+        {
+            end = LineEnd::CrLf;
+            ++at;
+        }
+        add(data + start, lineLength, end);
+        start = at + 1;
+    }
+    if (start < length)
+        add(data + start, length - start, LineEnd::None);
+}
+
 } // namespace
 
 DecodedJournal DecodeJournal(const char* bytes, std::size_t size)
 {
     DecodedJournal journal;
-    const wxString text = DecodeText(bytes, size, journal.exact);
-    const wchar_t* const data = text.wc_str();
-    const std::size_t length = text.length();
-
-    std::size_t start = 0;
-    for (std::size_t at = 0; at < length; ++at)
-    {
-        const wchar_t c = data[at];
-        if (c != L'\r' && c != L'\n')
-            continue;
-        JournalLine line;
-        line.text = wxString(data + start, at - start);
-        if (c == L'\r' && at + 1 < length && data[at + 1] == L'\n')
-        {
-            line.end = LineEnd::CrLf;
-            ++at;
-        }
-        else
-        {
-            line.end = c == L'\r' ? LineEnd::Cr : LineEnd::Lf;
-        }
-        journal.lines.push_back(std::move(line));
-        start = at + 1;
-    }
-    if (start < length)
-        journal.lines.push_back(JournalLine{wxString(data + start, length - start), LineEnd::None});
+    const std::wstring text = DecodeText(bytes, size, journal.exact);
+    journal.lines.reserve(CountLineBreaks(text) + 1);
+    SplitLines(text,
+               [&journal](const wchar_t* line, std::size_t length, LineEnd end) {
+                   journal.lines.push_back(JournalLine{wxString(line, length), end});
+               });
     return journal;
+}
+
+void DecodeJournalTexts(const char* bytes, std::size_t size, wxArrayString& lines)
+{
+    bool exact = true;
+    const std::wstring text = DecodeText(bytes, size, exact);
+    lines.Clear();
+    lines.Alloc(CountLineBreaks(text) + 1);
+    SplitLines(text, [&lines](const wchar_t* line, std::size_t length, LineEnd)
+               { lines.Add(wxString(line, length)); });
 }
 
 std::string EncodeJournal(const std::vector<JournalLine>& lines)

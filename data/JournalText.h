@@ -3,6 +3,7 @@
 #include <string>
 #include <vector>
 
+#include <wx/arrstr.h>
 #include <wx/string.h>
 
 namespace wyx
@@ -36,6 +37,9 @@ struct DecodedJournal
 // UTF-32; without one the text is UTF-8 when valid, else the single-byte
 // fallback. A line ends at CR LF, LF or CR. Any input gives a result.
 DecodedJournal DecodeJournal(const char* bytes, std::size_t size);
+
+// The same lines' texts alone, as a reader wants them, without the copy.
+void DecodeJournalTexts(const char* bytes, std::size_t size, wxArrayString& lines);
 
 // The lines as UTF-8 without a byte-order mark, each with its own line end.
 std::string EncodeJournal(const std::vector<JournalLine>& lines);

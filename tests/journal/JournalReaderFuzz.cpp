@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <filesystem>
 #include <memory>
 #include <string>
 
@@ -14,7 +15,14 @@
 namespace
 {
 
+std::string g_folder;
 std::string g_journal;
+
+void RemoveFolder()
+{
+    std::error_code ignored;
+    std::filesystem::remove_all(g_folder, ignored);
+}
 
 } // namespace
 
@@ -25,7 +33,9 @@ extern "C" int LLVMFuzzerInitialize(int*, char***)
     if (::mkdtemp(folder) == nullptr)
         std::abort();
     ::setenv("WYX_SYSTEM_ROOT", folder, 1);
-    g_journal = std::string(folder) + "/TiveraJobsLogFile.txt";
+    g_folder = folder;
+    g_journal = g_folder + "/TiveraJobsLogFile.txt";
+    std::atexit(RemoveFolder);
     return 0;
 }
 
