@@ -148,7 +148,8 @@ void HotFolderSimulator::Advance(const Step& step, double now)
     if (step.stage == JobStage::Finished || failsNow)
     {
         Finish(job);
-        m_steps.emplace(now + kCommittedLineStages * m_options.stepSeconds, Step{step.job, JobStage::Finished, true});
+        m_steps.emplace(now + kCommittedLineStages * m_options.stepSeconds,
+                        Step{step.job, JobStage::Finished, true});
         return;
     }
     Count(m_status->ModifyJob(StatusFields(job, StageStatus(step.stage))));

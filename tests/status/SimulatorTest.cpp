@@ -1,0 +1,179 @@
+#include <gtest/gtest.h>
+
+#include <map>
+#include <set>
+
+#include <wx/dir.h>
+#include <wx/ffile.h>
+#include <wx/filename.h>
+#include <wx/tokenzr.h>
+
+#include "StatusTestSupport.h"
+#include "data/JobReadWriter.h"
+#include "data/JobStatusManager.h"
+#include "platform/datasource/WyxDataSource.h"
+#include "tools/simulator/HotFolderSimulator.h"
+#include "tools/simulator/SimulatorOptions.h"
+
+namespace
+{
+
+using statustest::SystemRoot;
+
+const auto* const kWx = testing::AddGlobalTestEnvironment(new statustest::WxEnvironment);
+
+wxArrayString Pieces(const wxString& line)
+{
+    return wxStringTokenize(line, "\t", wxTOKEN_STRTOK);
+}
+
+wxArrayString ReadJournal(const wxString& path)
+{
+    wyx::JobsFileReadWriter reader;
+    reader.SetPath(path);
+    wxArrayString lines;
+    EXPECT_EQ(reader.ReadJobs(lines), wyx::JobOk) << path;
+    return lines;
+}
+
+SimulatorOptions FastOptions(const SystemRoot& root)
+{
+    SimulatorOptions options;
+    options.jobsPerSecond = 200;
+    options.durationSeconds = 0.2;
+    options.stepSeconds = 0.005;
+    options.failureShare = 0.5;
+    options.seed = 7;
+    options.seedGiven = true;
+    options.hotFolderRoot = root.Path() + "/srv/hotfolders";
+    return options;
+}
+
+TEST(SimulatorOptions, ReadsEveryOption)
+{
+    const char* argv[] = {"wyx-simulator",
+                          "--rate",
+                          "3/s",
+                          "--duration",
+                          "3600",
+                          "--failure-share",
+                          "0.5",
+                          "--seed",
+                          "42",
+                          "--data-dir",
+                          "/tmp/d",
+                          "--step-seconds",
+                          "0.1"};
+    SimulatorOptions options;
+    wxString problem;
+    ASSERT_TRUE(ParseSimulatorOptions(static_cast<int>(std::size(argv)), argv, options, problem)) << problem;
+    EXPECT_DOUBLE_EQ(options.jobsPerSecond, 3);
+    EXPECT_DOUBLE_EQ(options.durationSeconds, 3600);
+    EXPECT_DOUBLE_EQ(options.failureShare, 0.5);
+    EXPECT_DOUBLE_EQ(options.stepSeconds, 0.1);
+    EXPECT_TRUE(options.seedGiven);
+    EXPECT_EQ(options.seed, 42u);
+    EXPECT_EQ(options.dataDirectory, "/tmp/d");
+}
+
+TEST(SimulatorOptions, RefusesWhatItCannotRead)
+{
+    const std::vector<std::vector<const char*>> bad = {{"x", "--rate", "fast"},
+                                                       {"x", "--rate", "-3"},
+                                                       {"x", "--rate", "3/h"},
+                                                       {"x", "--failure-share", "2"},
+                                                       {"x", "--duration", "-1"},
+                                                       {"x", "--seed", "-4"},
+                                                       {"x", "--seed", "99999999999"},
+                                                       {"x", "--bogus", "1"},
+                                                       {"x", "--rate"},
+                                                       {"x", "stray"},
+                                                       {"x", "--data-dir", ""}};
+    for (const auto& argv : bad)
+    {
+        SimulatorOptions options;
+        wxString problem;
+        EXPECT_FALSE(ParseSimulatorOptions(static_cast<int>(argv.size()), argv.data(), options, problem))
+            << argv[1];
+        EXPECT_FALSE(problem.empty());
+    }
+    double perSecond = 0;
+    ASSERT_TRUE(ParseRate("30", perSecond));
+    EXPECT_DOUBLE_EQ(perSecond, 0.5);
+    ASSERT_TRUE(ParseRate("30/min", perSecond));
+    EXPECT_DOUBLE_EQ(perSecond, 0.5);
+}
+
+TEST(Simulator, WritesWellFormedTrafficThatTheModelsRead)
+{
+    SystemRoot root;
+    HotFolderSimulator simulator(FastOptions(root), [] { return false; });
+    wxString problem;
+    ASSERT_TRUE(simulator.Prepare(problem)) << problem;
+    JobStatusManager status(simulator.DataDirectory() + "TiveraJobsStatusFile.txt");
+    ASSERT_EQ(status.Parse(), 1);
+
+    const HotFolderSimulator::Totals totals = simulator.Run();
+    EXPECT_GT(totals.started, 10u);
+    EXPECT_EQ(totals.started, totals.succeeded + totals.failed);
+    EXPECT_GT(totals.failed, 0u);
+    EXPECT_EQ(totals.journalErrors, 0u);
+
+    wxArrayString hotFolders;
+    wxArrayString servers;
+    WyxDataSource::GetInstance().GetHotFoldersList(hotFolders);
+    WyxDataSource::GetInstance().GetServersList(servers);
+    EXPECT_GE(hotFolders.size(), 3u);
+    EXPECT_GE(servers.size(), 3u);
+    const std::set<wxString> folderSet(hotFolders.begin(), hotFolders.end());
+    const std::set<wxString> serverSet(servers.begin(), servers.end());
+
+    const wxArrayString log = ReadJournal(simulator.DataDirectory() + "TiveraJobsLogFile.txt");
+    EXPECT_EQ(log.size(), totals.started);
+    std::set<wxString> failedFolders;
+    unsigned failed = 0;
+    for (const wxString& line : log)
+    {
+        const wxArrayString pieces = Pieces(line);
+        ASSERT_EQ(pieces.size(), 8u) << line;
+        EXPECT_EQ(folderSet.count(pieces[1]), 1u) << line;
+        EXPECT_TRUE(pieces[2].StartsWith(pieces[1] + "/")) << line;
+        EXPECT_EQ(serverSet.count(pieces[3]), 1u) << line;
+        EXPECT_TRUE(pieces[4].IsNumber()) << line;
+        EXPECT_EQ(pieces[7], "ADDED");
+        if (pieces[5] != "Transferred Successfully")
+        {
+            ++failed;
+            failedFolders.insert(pieces[1]);
+        }
+    }
+    EXPECT_EQ(failed, totals.failed);
+    for (const wxString& folder : hotFolders)
+        EXPECT_EQ(wxFileName::FileExists(folder + "/[_KELVO_HotFolder_]/Error.er"),
+                  failedFolders.count(folder) == 1)
+            << folder;
+
+    // Every job finished and its committed line was removed again.
+    EXPECT_TRUE(ReadJournal(simulator.DataDirectory() + "TiveraJobsStatusFile.txt").empty());
+}
+
+TEST(Simulator, AStopRequestEndsTheRunBetweenTwoWholeOperations)
+{
+    SystemRoot root;
+    int checks = 0;
+    SimulatorOptions options = FastOptions(root);
+    options.durationSeconds = 60;
+    HotFolderSimulator simulator(options, [&checks] { return ++checks > 40; });
+    wxString problem;
+    ASSERT_TRUE(simulator.Prepare(problem)) << problem;
+    const HotFolderSimulator::Totals totals = simulator.Run();
+    EXPECT_GT(totals.started, 0u);
+
+    // What is left in progress is whole lines of nine pieces.
+    JobStatusManager status(simulator.DataDirectory() + "TiveraJobsStatusFile.txt");
+    for (const wxString& line : ReadJournal(simulator.DataDirectory() + "TiveraJobsStatusFile.txt"))
+        EXPECT_EQ(Pieces(line).size(), 9u) << line;
+    EXPECT_EQ(status.Parse(), 1);
+}
+
+} // namespace
