@@ -1,13 +1,15 @@
 #include "data/JobLogManager.h"
 
 #include <algorithm>
+#include <chrono>
+#include <condition_variable>
 #include <locale>
 #include <stdexcept>
+#include <thread>
 
 #include <wx/file.h>
 #include <wx/filefn.h>
 #include <wx/filename.h>
-#include <wx/utils.h>
 
 #include "data/DataLocations.h"
 #include "data/DosTime.h"
@@ -26,8 +28,7 @@ constexpr int kLogChannel = 1;
 
 // ClearLog runs on the GUI thread: a producer that keeps the journal locked
 // longer than this is not waited for.
-constexpr int kClearLockWaitMs = 2000;
-constexpr int kClearLockRetryMs = 10;
+constexpr std::chrono::milliseconds kClearLockLimit{3000};
 
 const std::locale& KeyFoldingLocale()
 {
@@ -124,17 +125,66 @@ bool PieceIsNoCase(const wchar_t* line, const PieceSpan& piece, const std::wstri
 const std::wstring kSucceeded = L"Transferred Successfully";
 const std::wstring kAdded = L"ADDED";
 
-bool LockWithin(named_mutex_lock& lock, int milliseconds)
+// Holds a journal's lock, waited for at most a limit. The wait blocks, so the
+// kernel queues it and a producer appending without pause cannot starve it as
+// it would a poll; it runs on a helper thread that the caller walks away from
+// at the limit, and that then lets go of the lock as soon as it gets it.
+class BoundedJournalLock
 {
-    for (int waited = 0;; waited += kClearLockRetryMs)
+public:
+    BoundedJournalLock(const wxString& name, std::chrono::milliseconds limit)
+        : m_shared(std::make_shared<Shared>(name))
     {
-        if (lock.try_lock())
-            return true;
-        if (waited >= milliseconds)
-            return false;
-        wxMilliSleep(kClearLockRetryMs);
+        if (m_shared->lock.try_lock())
+        {
+            m_locked = true;
+            return;
+        }
+        std::thread(
+            [shared = m_shared]
+            {
+                const bool locked = shared->lock.lock();
+                std::lock_guard<std::mutex> guard(shared->mutex);
+                shared->finished = true;
+                shared->locked = locked;
+                if (shared->abandoned)
+                    shared->lock.unlock();
+                shared->done.notify_one();
+            })
+            .detach();
+        std::unique_lock<std::mutex> guard(m_shared->mutex);
+        if (m_shared->done.wait_for(guard, limit, [this] { return m_shared->finished; }))
+            m_locked = m_shared->locked;
+        else
+            m_shared->abandoned = true;
     }
-}
+    ~BoundedJournalLock()
+    {
+        if (m_locked)
+            m_shared->lock.unlock();
+    }
+
+    bool IsLocked() const { return m_locked; }
+
+private:
+    BoundedJournalLock(const BoundedJournalLock&) = delete;
+    BoundedJournalLock& operator=(const BoundedJournalLock&) = delete;
+
+    struct Shared
+    {
+        explicit Shared(const wxString& name) : lock(name) {}
+
+        std::mutex mutex;
+        std::condition_variable done;
+        bool finished = false;
+        bool abandoned = false;
+        bool locked = false;
+        named_mutex_lock lock;
+    };
+
+    std::shared_ptr<Shared> m_shared;
+    bool m_locked = false;
+};
 
 } // namespace
 
@@ -412,8 +462,7 @@ int JobLogManager::ClearLog()
         // Held across delete and create, so that a producer's append lands
         // either before (and is cleared) or after (in the new file), and never
         // writes the old lines back.
-        named_mutex_lock journalLock(m_lockName);
-        const bool locked = LockWithin(journalLock, kClearLockWaitMs);
+        const BoundedJournalLock journalLock(m_lockName, kClearLockLimit);
         {
             std::lock_guard<std::mutex> guard(m_lock);
             m_firstSequence += m_records.size();
@@ -422,7 +471,7 @@ int JobLogManager::ClearLog()
             m_keys.clear();
             ++m_clearGeneration;
         }
-        if (locked)
+        if (journalLock.IsLocked())
             replaced = ReplaceJournalWithEmptyFile();
     }
     ResetAllFolderErrors();
