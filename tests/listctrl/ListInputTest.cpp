@@ -317,3 +317,76 @@ TEST_F(ListInput, VetoedDragLeavesTheColumnAlone)
     EXPECT_EQ(m_list->GetColumnWidth(0), 100);
 }
 } // namespace
+
+namespace
+{
+TEST_F(ListInput, WheelScrollsByLinesAndStopsAtTheEnds)
+{
+    Build(0, 100);
+    wxMouseEvent wheel(wxEVT_MOUSEWHEEL);
+    wheel.SetEventObject(m_rows);
+    wheel.m_wheelRotation = -120;
+    wheel.m_wheelDelta = 120;
+    wheel.m_linesPerAction = 3;
+    m_rows->GetEventHandler()->ProcessEvent(wheel);
+    EXPECT_EQ(m_rows->GetTopItem(), 3);
+    wheel.m_wheelRotation = -60;
+    m_rows->GetEventHandler()->ProcessEvent(wheel);
+    EXPECT_EQ(m_rows->GetTopItem(), 3) << "half a notch waits for the other half";
+    m_rows->GetEventHandler()->ProcessEvent(wheel);
+    EXPECT_EQ(m_rows->GetTopItem(), 6);
+    wheel.m_wheelRotation = 120 * 10;
+    m_rows->GetEventHandler()->ProcessEvent(wheel);
+    EXPECT_EQ(m_rows->GetTopItem(), 0);
+    wheel.m_wheelRotation = -120 * 100;
+    m_rows->GetEventHandler()->ProcessEvent(wheel);
+    EXPECT_EQ(m_rows->GetTopItem() + m_rows->GetCountPerPage(), 100);
+}
+
+TEST_F(ListInput, ScrollbarEventsMoveByLinesAndPages)
+{
+    Build(0, 100);
+    const long page = m_rows->GetCountPerPage();
+    struct Step
+    {
+        wxEventType type;
+        long expectedTop;
+    };
+    for (const Step& step : {Step{wxEVT_SCROLLWIN_LINEDOWN, 1}, Step{wxEVT_SCROLLWIN_PAGEDOWN, 1 + page},
+                             Step{wxEVT_SCROLLWIN_LINEUP, page}, Step{wxEVT_SCROLLWIN_BOTTOM, 100 - page},
+                             Step{wxEVT_SCROLLWIN_TOP, 0}})
+    {
+        wxScrollWinEvent event(step.type, 0, wxVERTICAL);
+        event.SetEventObject(m_rows);
+        m_rows->GetEventHandler()->ProcessEvent(event);
+        EXPECT_EQ(m_rows->GetTopItem(), step.expectedTop) << "event " << step.type;
+    }
+}
+
+TEST_F(ListInput, HeaderFollowsTheRowsWhenScrolledSideways)
+{
+    m_list = MakeList(wxLC_REPORT | wxLC_VRULES);
+    for (int column = 0; column < 3; ++column)
+        m_list->InsertColumn(column, wxS("Wide"), wxLIST_FORMAT_LEFT, 300);
+    m_list->InsertItem(0, wxString());
+    m_rows = m_list->GetMainWindow();
+    m_rows->LayoutIfNeeded();
+    m_rows->ScrollToX(100);
+    ASSERT_EQ(m_rows->GetScrollX(), 100);
+
+    const wxColour border = Themer::GetThemeService()->GetTheme("HeaderView").lineColour;
+    const wxImage header = RenderHeader(m_list);
+    EXPECT_EQ(PixelAt(header, 200, 12), border) << "first column's edge moved left by the scroll";
+    EXPECT_NE(PixelAt(header, 300, 12), border);
+    const wxImage rows = RenderRows(m_list);
+    const int mid = m_rows->GetLineHeight() / 2;
+    EXPECT_EQ(PixelAt(rows, 198, mid), ListTheme().lineColour);
+    EXPECT_EQ(PixelAt(rows, 498, mid), ListTheme().lineColour);
+
+    SendKey(m_rows, WXK_LEFT);
+    EXPECT_EQ(m_rows->GetScrollX(), 85);
+    m_rows->ScrollToX(100000);
+    EXPECT_EQ(m_rows->GetScrollX(), 900 - m_rows->GetClientSize().GetWidth())
+        << "no scrolling past the last column";
+}
+} // namespace
