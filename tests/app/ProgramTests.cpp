@@ -35,19 +35,20 @@ class Program
 {
 public:
     // uid: run as that user (and group) instead of the current one.
-    Program(const std::vector<std::string>& environment, std::optional<uid_t> uid = std::nullopt)
+    Program(const std::vector<std::string>& environment, std::optional<uid_t> uid = std::nullopt,
+            const std::string& program = WYX_PROGRAM)
     {
         std::vector<char*> envp;
         for (const std::string& entry : environment)
             envp.push_back(const_cast<char*>(entry.c_str()));
         envp.push_back(nullptr);
-        char* argv[] = {const_cast<char*>(WYX_PROGRAM), nullptr};
+        char* argv[] = {const_cast<char*>(program.c_str()), nullptr};
         m_pid = ::fork();
         if (m_pid == 0)
         {
             if (uid && (::setgroups(0, nullptr) != 0 || ::setgid(*uid) != 0 || ::setuid(*uid) != 0))
                 ::_exit(126);
-            ::execve(WYX_PROGRAM, argv, envp.data());
+            ::execve(argv[0], argv, envp.data());
             ::_exit(127);
         }
     }
@@ -286,6 +287,26 @@ protected:
         return environment;
     }
 
+    // The program with its libraries and files in a folder every user can
+    // read: the build folder may sit below a home that others cannot enter.
+    std::filesystem::path InstalledCopy()
+    {
+        const std::filesystem::path source = std::filesystem::path(WYX_PROGRAM).parent_path();
+        const std::filesystem::path target = folder.Path() / "bin";
+        std::filesystem::create_directories(target);
+        for (const auto& entry : std::filesystem::directory_iterator(source))
+        {
+            const std::string name = entry.path().filename().string();
+            const bool needed = name == std::filesystem::path(WYX_PROGRAM).filename().string() ||
+                                name.find(".so") != std::string::npos || entry.path().extension() == ".cfg" ||
+                                entry.path().extension() == ".ico";
+            if (needed && entry.is_regular_file())
+                std::filesystem::copy_file(entry.path(), target / name);
+        }
+        ::chmod(target.c_str(), 0755);
+        return target / std::filesystem::path(WYX_PROGRAM).filename();
+    }
+
     std::string CrashCalls() const
     {
         std::ifstream file(crashLog);
@@ -349,7 +370,7 @@ TEST_F(ProgramTest, AnotherUserRunsItsOwnCopyBesideTheFirst)
     const Window firstWindow = x.WaitForWindow(first);
     ASSERT_NE(firstWindow, 0u);
 
-    Program other(Environment("other-home", kOtherUser), kOtherUser);
+    Program other(Environment("other-home", kOtherUser), kOtherUser, InstalledCopy().string());
     const Window otherWindow = x.WaitForWindow(other);
     ASSERT_NE(otherWindow, 0u) << "the other user's copy ended without a window";
     EXPECT_EQ(x.Title(otherWindow), kTitle);
