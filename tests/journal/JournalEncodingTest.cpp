@@ -153,7 +153,15 @@ INSTANTIATE_TEST_SUITE_P(
         BytesCase{"TruncatedUtf8Sequence", "1\tab\xE2\x82", {"1\tab\xC3\xA2\xC2\x82"}, true},
         BytesCase{"LoneByteThatStartsAMark", "\xFF", {"\xC3\xBF"}, true},
         BytesCase{"TwoBytesOfAUtf8Mark", "\xEF\xBB", {"\xC3\xAF\xC2\xBB"}, true},
-        BytesCase{"MarkOnly", "\xEF\xBB\xBF", {}, true}, BytesCase{"Empty", "", {}, true},
+        BytesCase{"MarkOnly", "\xEF\xBB\xBF", {}, true},
+        // A mark written twice must not survive as a mark of the rewrite.
+        BytesCase{"Utf16MarkTwice", Bytes({0xFF, 0xFE, 0xFF, 0xFE, '1', 0, '\t', 0, 'a', 0}), {"1\ta"}, true},
+        BytesCase{"Utf8MarkTwice",
+                  "\xEF\xBB\xBF\xEF\xBB\xBF"
+                  "1\ta",
+                  {"1\ta"},
+                  true},
+        BytesCase{"Empty", "", {}, true},
         BytesCase{"NulCharacter", std::string("1\ta\0b\r\n", 7), {std::string("1\ta\0b", 5)}, true},
         BytesCase{"Utf16WithOddTrailingByte",
                   Bytes({0xFF, 0xFE, '1', 0, '\t', 0, 'a', 0, '\n', 0, 'b'}),

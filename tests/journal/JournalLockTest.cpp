@@ -53,7 +53,8 @@ TEST_F(JournalLock, AWritingOperationWaitsUntilTheLockIsReleased)
                               returned = true;
                               return result;
                           });
-    // Whenever the writer got this far, it must not have passed the lock.
+    ASSERT_TRUE(
+        WaitUntilBlockedOn(LockFile("TiveraJobsStatusFile"), [&returned] { return returned.load(); }));
     EXPECT_FALSE(returned.load());
     EXPECT_EQ(ReadBytes(StatusJournal()), "1\ta\tADDED\r\n");
 
@@ -68,6 +69,9 @@ TEST_F(JournalLock, TheProducerCommandWaitsForTheLockToo)
     ExternalLockHolder holder(LockFile("TiveraJobsLogFile"));
     ASSERT_TRUE(holder.Holding());
     auto add = std::async(std::launch::async, [] { return RunTool({"log", "add", "9\tz"}).status; });
+    ASSERT_TRUE(
+        WaitUntilBlockedOn(LockFile("TiveraJobsLogFile"), [&add]
+                           { return add.wait_for(std::chrono::seconds(0)) == std::future_status::ready; }));
     EXPECT_EQ(ReadBytes(LogJournal()), "");
     holder.Release();
     EXPECT_EQ(add.get(), 0);

@@ -4,6 +4,7 @@
 #include <filesystem>
 #include <fstream>
 #include <sstream>
+#include <thread>
 
 #include <sys/stat.h>
 #include <sys/wait.h>
@@ -121,6 +122,25 @@ ToolRun RunTool(const std::vector<std::string>& arguments, const std::string& pr
     const int status = ::pclose(process);
     run.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
     return run;
+}
+
+bool WaitUntilBlockedOn(const std::string& lockFile, const std::function<bool()>& finished)
+{
+    struct stat info;
+    if (::stat(lockFile.c_str(), &info) != 0)
+        return false;
+    // A waiter's line reads "N: -> FLOCK ADVISORY WRITE <pid> <maj:min:inode> 0 EOF".
+    const std::string inode = ":" + std::to_string(info.st_ino) + " ";
+    for (;;)
+    {
+        std::ifstream locks("/proc/locks");
+        for (std::string line; std::getline(locks, line);)
+            if (line.find("->") != std::string::npos && line.find(inode) != std::string::npos)
+                return true;
+        if (finished())
+            return false;
+        std::this_thread::sleep_for(std::chrono::milliseconds(1));
+    }
 }
 
 ExternalLockHolder::ExternalLockHolder(const std::string& lockFile) : m_releaseFifo(lockFile + ".release")

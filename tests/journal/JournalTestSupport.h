@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdio>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -56,6 +57,11 @@ struct ToolRun
 // before the command (ulimit, trap).
 ToolRun RunTool(const std::vector<std::string>& arguments, const std::string& prefix = std::string());
 std::string ShellQuoted(const std::string& text);
+
+// Polls the kernel's lock table until some process or thread is blocked
+// waiting for the lock file (true), or until finished() says the candidate
+// waiter has already returned without waiting (false).
+bool WaitUntilBlockedOn(const std::string& lockFile, const std::function<bool()>& finished);
 
 // Another process (util-linux flock) holding a lock file until Release.
 class ExternalLockHolder
