@@ -111,10 +111,14 @@ bool DecodeDosTime(const wxString& dosTimeText, CalendarFields& fields)
     return true;
 }
 
-wxString WalkDatePattern(const wxString& pattern, const CalendarFields& fields,
-                         const wyxos::LocaleNames& names)
+namespace
 {
-    wxString out;
+
+// The walkers append to the caller's text, so that a whole "date, time" is
+// built in one string without temporaries.
+void AppendDate(wxString& out, const wxString& pattern, const CalendarFields& fields,
+                const wyxos::LocaleNames& names)
+{
     const size_t monthIndex = (fields.month - 1) % 12;
     const size_t dayIndex = fields.weekDay % 7;
     for (size_t i = 0; i < pattern.length();)
@@ -153,13 +157,11 @@ wxString WalkDatePattern(const wxString& pattern, const CalendarFields& fields,
         }
         i += run;
     }
-    return out;
 }
 
-wxString WalkTimePattern(const wxString& pattern, const CalendarFields& fields,
-                         const wyxos::LocaleNames& names)
+void AppendTime(wxString& out, const wxString& pattern, const CalendarFields& fields,
+                const wyxos::LocaleNames& names)
 {
-    wxString out;
     const wxString& designator = fields.hour < 12 ? names.am : names.pm;
     for (size_t i = 0; i < pattern.length();)
     {
@@ -191,29 +193,58 @@ wxString WalkTimePattern(const wxString& pattern, const CalendarFields& fields,
         }
         i += run;
     }
+}
+
+// Appends the date in the locale's pattern, or the library's %x when the
+// pattern cannot be read or yields nothing.
+void AppendLocaleDate(wxString& out, const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
+{
+    const size_t start = out.length();
+    if (locale.hasDatePattern)
+        AppendDate(out, locale.datePattern, fields, locale.names);
+    if (out.length() == start)
+        out += MomentFromFields(fields).Format("%x", wxDateTime::Local);
+}
+
+void AppendLocaleTime(wxString& out, const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
+{
+    const size_t start = out.length();
+    if (locale.hasTimePattern)
+        AppendTime(out, locale.timePattern, fields, locale.names);
+    if (out.length() == start)
+        out += MomentFromFields(fields).Format("%X", wxDateTime::Local);
+}
+
+} // namespace
+
+wxString WalkDatePattern(const wxString& pattern, const CalendarFields& fields,
+                         const wyxos::LocaleNames& names)
+{
+    wxString out;
+    AppendDate(out, pattern, fields, names);
+    return out;
+}
+
+wxString WalkTimePattern(const wxString& pattern, const CalendarFields& fields,
+                         const wyxos::LocaleNames& names)
+{
+    wxString out;
+    AppendTime(out, pattern, fields, names);
     return out;
 }
 
 wxString FormatLocaleDate(const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
 {
-    if (locale.hasDatePattern)
-    {
-        wxString text = WalkDatePattern(locale.datePattern, fields, locale.names);
-        if (!text.empty())
-            return text;
-    }
-    return MomentFromFields(fields).Format("%x", wxDateTime::Local);
+    wxString out;
+    AppendLocaleDate(out, fields, locale);
+    return out;
 }
 
 wxString FormatLocaleTime(const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
 {
-    if (locale.hasTimePattern)
-    {
-        wxString text = WalkTimePattern(locale.timePattern, fields, locale.names);
-        if (!text.empty())
-            return text;
-    }
-    return MomentFromFields(fields).Format("%X", wxDateTime::Local);
+    wxString out;
+    AppendLocaleTime(out, fields, locale);
+    return out;
 }
 
 wxString FormatDosTime(const wxString& dosTimeText, const wyxos::LocaleTimeInfo& locale)
@@ -221,9 +252,11 @@ wxString FormatDosTime(const wxString& dosTimeText, const wyxos::LocaleTimeInfo&
     CalendarFields fields;
     if (!DecodeDosTime(dosTimeText, fields))
         return wxString();
-    wxString text = FormatLocaleDate(fields, locale);
+    wxString text;
+    text.reserve(32);
+    AppendLocaleDate(text, fields, locale);
     text += L", ";
-    text += FormatLocaleTime(fields, locale);
+    AppendLocaleTime(text, fields, locale);
     return text;
 }
 

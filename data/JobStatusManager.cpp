@@ -54,7 +54,11 @@ void JobStatusManager::SetRunning(bool running)
 
 JobStatusManager::ReadOutcome JobStatusManager::ReadChangedJournal(wxArrayString& lines)
 {
-    if (!m_reader || !wyxos::StatFile(m_journalPath).exists)
+    // An unchanged stamp needs no lock: an idle poll is one stat.
+    if (!m_reader)
+        return ReadOutcome::Unchanged;
+    const wyxos::FileStamp seenNow = wyxos::StatFile(m_journalPath);
+    if (!seenNow.exists || seenNow == m_lastSeen)
         return ReadOutcome::Unchanged;
 
     wyxos::FileStamp stamp;
@@ -65,7 +69,7 @@ JobStatusManager::ReadOutcome JobStatusManager::ReadChangedJournal(wxArrayString
         if (!lock.try_lock())
             return ReadOutcome::Unchanged;
         stamp = wyxos::StatFile(m_journalPath);
-        if (stamp == m_lastSeen)
+        if (!stamp.exists || stamp == m_lastSeen)
             return ReadOutcome::Unchanged;
     }
 
@@ -93,7 +97,7 @@ int JobStatusManager::Parse()
         if (!m_running)
             break;
         if (ParseStatusLine(line, record))
-            jobs.push_back(record);
+            jobs.push_back(std::move(record));
     }
 
     {

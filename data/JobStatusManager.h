@@ -8,13 +8,9 @@
 #include <wx/arrstr.h>
 #include <wx/string.h>
 
+#include "data/JobReadWriter.h"
 #include "data/JobRecord.h"
 #include "platform/os/FileStamp.h"
-
-namespace wyx
-{
-class IJobReadWriter;
-}
 
 // The jobs in progress, as the status journal lists them. The polling thread
 // calls Refresh once a second; a changed journal is read whole, its shown lines

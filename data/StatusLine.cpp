@@ -1,6 +1,7 @@
 #include "data/StatusLine.h"
 
 #include <array>
+#include <cwchar>
 
 #include "data/DosTime.h"
 
@@ -54,8 +55,23 @@ bool ParseStatusLine(const wxString& line, JobRecord& record)
         return false;
     auto piece = [&](Piece p) { return line.substr(pieces[p].first, pieces[p].second); };
 
-    const wxString action = piece(Action);
-    if (!action.IsSameAs("ADDED", false) && !action.IsSameAs("MODIFIED", false))
+    // Compared in place: a narrow literal or a copy would cost an allocation per line.
+    const wchar_t* action = line.wc_str() + pieces[Action].first;
+    const size_t actionLength = pieces[Action].second;
+    auto isAction = [&](const wchar_t* tag)
+    {
+        if (std::wcslen(tag) != actionLength)
+            return false;
+        // ASCII folding: a Turkish locale must not turn "modified" into "MODİFİED".
+        for (size_t i = 0; i < actionLength; ++i)
+        {
+            const wchar_t c = action[i] >= L'a' && action[i] <= L'z' ? action[i] - (L'a' - L'A') : action[i];
+            if (c != tag[i])
+                return false;
+        }
+        return true;
+    };
+    if (!isAction(L"ADDED") && !isAction(L"MODIFIED"))
         return false;
 
     record[StatusField::Key] = piece(Key);
