@@ -390,7 +390,7 @@ TEST_F(LogModel, RefreshTellsTheLogChannelOnlyWhenRecordsCameIn)
     EXPECT_EQ(1, m_model.Refresh());
 
     // The view's turn comes only now, after several polls.
-    wxTheApp->ProcessPendingEvents();
+    wxAppConsole::GetInstance()->ProcessPendingEvents();
     EXPECT_EQ(3, view.updates);
     EXPECT_EQ((std::vector<wxString>{"1", "2", "3"}), Keys(view.shown));
     // What the view would have lost through the latest read's list alone.
