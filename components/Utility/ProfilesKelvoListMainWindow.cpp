@@ -83,9 +83,40 @@ void ProfilesKelvoListMainWindow::SetColumnWidth(long col, int width)
 {
     if (ProfilesKelvoListColumn* column = GetColumnAt(col))
     {
+        if (width == wxLIST_AUTOSIZE || width == wxLIST_AUTOSIZE_USEHEADER)
+            width = AutoColumnWidth(col, width == wxLIST_AUTOSIZE_USEHEADER);
         column->width = std::max(0, width);
         MarkDirty();
     }
+}
+
+int ProfilesKelvoListMainWindow::AutoColumnWidth(long col, bool useHeader) const
+{
+    constexpr int kTextRoom = 8 + 2 * 4;
+    const ProfilesKelvoListColumn& column = m_columns[col];
+    int widest = 0;
+    if (useHeader)
+    {
+        widest = GetTextExtent(column.text).GetWidth();
+        if (column.image >= 0 && m_headerImages)
+            widest += m_headerImages->GetSize().GetWidth() + 2;
+        return widest + kTextRoom;
+    }
+    // Virtual rows are measured only where they are seen.
+    const long first = IsVirtual() ? m_topItem : 0;
+    const long last = IsVirtual() ? GetLastVisibleItem() : GetItemCount() - 1;
+    for (long item = first; item >= 0 && item <= last; ++item)
+    {
+        const ProfilesKelvoListLineData line = GetLine(item);
+        const ProfilesKelvoListCell& cell = line.GetCell(col);
+        int width = GetTextExtent(cell.text).GetWidth();
+        if (cell.image >= 0 && m_smallImages)
+            width += m_smallImages->GetSize().GetWidth() + 5;
+        else if (cell.image == kCellImageStatusCircle || cell.image == kCellImageStatusSquare)
+            width += 24;
+        widest = std::max(widest, width);
+    }
+    return widest + kTextRoom;
 }
 
 // ---------------------------------------------------------------- items

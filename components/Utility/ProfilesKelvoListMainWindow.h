@@ -30,6 +30,7 @@ public:
     int GetTotalColumnWidth() const;
     // Left edge of a column counted from the first column's left edge.
     int GetColumnLeft(long col) const;
+    // wxLIST_AUTOSIZE fits the widest cell, wxLIST_AUTOSIZE_USEHEADER the label.
     void SetColumnWidth(long col, int width);
 
     // Items
@@ -101,6 +102,7 @@ public:
 
 private:
     // Layout
+    int AutoColumnWidth(long col, bool useHeader) const;
     void UpdateLineHeight();
     void UpdateScrollbars();
     void ClampScrollPosition();
@@ -120,7 +122,6 @@ private:
     void OnSize(wxSizeEvent& event);
     void OnFocus(wxFocusEvent& event);
     void OnMouseWheel(wxMouseEvent& event);
-    void ScrollByEvent(wxScrollWinEvent& event);
     void ClickItem(long item, bool ctrl, bool shift);
     void MoveCurrentByKey(long target, bool ctrl, bool shift);
     bool SendListEvent(wxEventType type, long item, int column = -1) const;

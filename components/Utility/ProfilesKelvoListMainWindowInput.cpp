@@ -211,11 +211,6 @@ void ProfilesKelvoListMainWindow::OnMouseWheel(wxMouseEvent& event)
 
 void ProfilesKelvoListMainWindow::OnScroll(wxScrollWinEvent& event)
 {
-    ScrollByEvent(event);
-}
-
-void ProfilesKelvoListMainWindow::ScrollByEvent(wxScrollWinEvent& event)
-{
     const wxEventType type = event.GetEventType();
     const bool vertical = event.GetOrientation() == wxVERTICAL;
     const long position = vertical ? m_topItem : m_scrollX;

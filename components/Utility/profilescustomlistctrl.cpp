@@ -85,10 +85,11 @@ long ProfilesKelvoProfilesListCtrl::InsertColumn(long col, const wxListItem& inf
         column.format = info.GetAlign();
     if (mask & wxLIST_MASK_IMAGE)
         column.image = info.GetImage();
-    column.width = (mask & wxLIST_MASK_WIDTH) ? info.GetWidth() : -1;
-    if (column.width == wxLIST_AUTOSIZE_USEHEADER)
-        column.width = m_header->GetTextExtent(column.text).GetWidth() + 16;
+    const int width = (mask & wxLIST_MASK_WIDTH) ? info.GetWidth() : -1;
+    column.width = width;
     const long at = m_main->InsertColumn(col, column);
+    if (width == wxLIST_AUTOSIZE_USEHEADER)
+        m_main->SetColumnWidth(at, wxLIST_AUTOSIZE_USEHEADER);
     m_header->Refresh();
     return at;
 }

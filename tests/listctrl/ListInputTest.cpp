@@ -390,3 +390,19 @@ TEST_F(ListInput, HeaderFollowsTheRowsWhenScrolledSideways)
         << "no scrolling past the last column";
 }
 } // namespace
+
+namespace
+{
+TEST_F(ListInput, AutosizeFitsTheWidestCellOrTheLabel)
+{
+    Build(0, 0);
+    m_list->InsertItem(0, wxS("short"));
+    m_list->InsertItem(1, wxS("a considerably longer cell text"));
+    const int widest = m_rows->GetTextExtent(wxS("a considerably longer cell text")).GetWidth();
+    ASSERT_TRUE(m_list->SetColumnWidth(0, wxLIST_AUTOSIZE));
+    EXPECT_EQ(m_list->GetColumnWidth(0), widest + 16);
+    ASSERT_TRUE(m_list->SetColumnWidth(0, wxLIST_AUTOSIZE_USEHEADER));
+    EXPECT_EQ(m_list->GetColumnWidth(0), m_rows->GetTextExtent(wxS("Name")).GetWidth() + 16);
+    EXPECT_FALSE(m_list->SetColumnWidth(5, 10)) << "no such column";
+}
+} // namespace

@@ -209,6 +209,8 @@ private:
     CustomListCtrl* m_jobTable = nullptr;
 };
 
+} // namespace
+
 class GalleryApp : public wxApp
 {
 public:
@@ -221,6 +223,5 @@ public:
         return true;
     }
 };
-} // namespace
 
 wxIMPLEMENT_APP(GalleryApp);
