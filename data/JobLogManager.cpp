@@ -20,6 +20,10 @@
 #include "pump/CustomEvents.h"
 #include "pump/EventBus.h"
 
+// Lines are examined in place through wc_str(), which is a pointer into the
+// string only where wxString holds wide characters.
+static_assert(wxUSE_UNICODE_WCHAR, "journal lines are read in place as wide characters");
+
 namespace
 {
 
