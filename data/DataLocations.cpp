@@ -13,7 +13,7 @@
 namespace
 {
 
-const wxString kConfigurationElement = "WyxConfiguration";
+constexpr const wchar_t* kConfigurationElement = L"WyxConfiguration";
 
 // The first "WyxConfiguration" below the root: the root's own children first,
 // then each child's subtree in document order, depth first. Walked with an

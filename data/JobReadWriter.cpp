@@ -18,7 +18,7 @@ namespace
 
 constexpr std::size_t kLogTrimThreshold = 10000;
 constexpr std::size_t kLogTrimCount = 3000;
-const wxString kLogJournalMarker = "TiveraJobsLogFile";
+constexpr const wchar_t* kLogJournalMarker = L"TiveraJobsLogFile";
 
 enum class Access
 {

@@ -128,6 +128,8 @@ int Run(const Command& command, std::FILE* out)
 {
     std::unique_ptr<wyx::IJobReadWriter> created(CreateJobReadWriter(kJobsFileReadWriterKind));
     auto* journal = static_cast<wyx::JobsFileReadWriter*>(created.get());
+    if (journal == nullptr)
+        return wyx::JobFileMissing;
     journal->SetPath(command.journal);
 
     wxString argument = command.argument;
