@@ -142,6 +142,7 @@ void ProfilesKelvoListMainWindow::AfterCountChanged()
         m_current = count - 1;
     if (m_anchor >= count)
         m_anchor = count > 0 ? count - 1 : -1;
+    ForgetCacheHint();
     MarkDirty();
 }
 
@@ -188,6 +189,7 @@ void ProfilesKelvoListMainWindow::DeleteAllLines()
     m_current = -1;
     m_anchor = -1;
     m_topItem = 0;
+    ForgetCacheHint();
     MarkDirty();
 }
 
@@ -539,6 +541,8 @@ void ProfilesKelvoListMainWindow::RefreshLine(long item)
 
 void ProfilesKelvoListMainWindow::RefreshLines(long from, long to)
 {
+    // The rows' data changed: an owner caching them needs a fresh hint.
+    ForgetCacheHint();
     // A pending layout repaints everything anyway.
     if (m_dirty)
         return;

@@ -96,6 +96,14 @@ public:
 
     // Draws the rows that the update rectangle touches into any DC.
     void Render(wxDC& dc, const wxRect& update) const;
+    // Virtual lists: tells the owner which rows the next paint asks for
+    // (wxEVT_LIST_CACHE_HINT), once per distinct range.
+    void HintVisibleRange();
+    void ForgetCacheHint()
+    {
+        m_lastHintFrom = -1;
+        m_lastHintTo = -1;
+    }
 
     void OnInternalIdle() override;
     bool AcceptsFocus() const override { return true; }
@@ -110,7 +118,6 @@ private:
 
     // Painting (ProfilesKelvoListMainWindowPaint.cpp)
     void OnPaint(wxPaintEvent& event);
-    void SendCacheHint(long from, long to);
     void DrawRow(wxDC& dc, long item, const wxRect& rowRect, bool selected, bool odd) const;
     void DrawRules(wxDC& dc, long firstVisible, long lastVisible) const;
     void DrawResizeGuide(wxDC& dc) const;

@@ -77,13 +77,16 @@ void DrawListStatusMark(wxDC& dc, int image, int x, int rowTop, const wxColour& 
 void ProfilesKelvoListMainWindow::OnPaint(wxPaintEvent&)
 {
     wxAutoBufferedPaintDC dc(this);
-    if (IsVirtual() && !m_dirty && !IsFrozen() && GetItemCount() > 0)
-        SendCacheHint(m_topItem, GetLastVisibleItem());
+    HintVisibleRange();
     Render(dc, GetUpdateRegion().GetBox());
 }
 
-void ProfilesKelvoListMainWindow::SendCacheHint(long from, long to)
+void ProfilesKelvoListMainWindow::HintVisibleRange()
 {
+    if (!IsVirtual() || m_dirty || IsFrozen() || GetItemCount() == 0)
+        return;
+    const long from = m_topItem;
+    const long to = GetLastVisibleItem();
     if (from == m_lastHintFrom && to == m_lastHintTo)
         return;
     m_lastHintFrom = from;

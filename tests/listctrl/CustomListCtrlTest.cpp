@@ -173,3 +173,31 @@ TEST_F(JobTable, CreatesInTwoStepsWithTheHeaderRecord)
     EXPECT_TRUE(table->IsVirtual());
 }
 } // namespace
+
+namespace
+{
+TEST_F(JobTable, CacheHintNamesTheVisibleRowsOncePerRangeAndAgainAfterAnUpdate)
+{
+    CustomListCtrl* table = MakeTable();
+    std::vector<std::pair<long, long>> hints;
+    table->Bind(wxEVT_LIST_CACHE_HINT, [&hints](wxListEvent& event)
+                { hints.emplace_back(event.GetCacheFrom(), event.GetCacheTo()); });
+    table->SetItemCount(1000);
+    ProfilesKelvoListMainWindow* rows = table->GetMainWindow();
+    rows->HintVisibleRange();
+    EXPECT_TRUE(hints.empty()) << "nothing before the layout";
+    rows->LayoutIfNeeded();
+    rows->HintVisibleRange();
+    const long last = rows->GetLastVisibleItem();
+    ASSERT_GT(last, 5);
+    EXPECT_EQ(hints, (std::vector<std::pair<long, long>>{{0, last}}));
+    rows->HintVisibleRange();
+    EXPECT_EQ(hints.size(), 1u) << "the same range is not hinted twice";
+    rows->ScrollToTop(100);
+    rows->HintVisibleRange();
+    EXPECT_EQ(hints.back(), std::make_pair(100L, 100 + last));
+    table->RefreshItems(0, 999);
+    rows->HintVisibleRange();
+    EXPECT_EQ(hints.size(), 3u) << "refreshed rows are hinted again";
+}
+} // namespace
