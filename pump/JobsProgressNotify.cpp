@@ -1,7 +1,18 @@
 #include "pump/JobsProgressNotify.h"
 
-// The models' Refresh and SetRunning calls join these bodies, log model first,
-// once the models are part of the build.
-void JobsProgressNotify::Notify() {}
+#include "data/JobLogManager.h"
+#include "data/JobStatusManager.h"
 
-void JobsProgressNotify::SetRunning(bool running) {}
+// Each model re-reads its journal only when it changed and publishes its own
+// update; their results are not needed here.
+void JobsProgressNotify::Notify()
+{
+    JobLogManager::GetInstance().Refresh();
+    JobStatusManager::GetInstance().Refresh();
+}
+
+void JobsProgressNotify::SetRunning(bool running)
+{
+    JobLogManager::GetInstance().SetRunning(running);
+    JobStatusManager::GetInstance().SetRunning(running);
+}
