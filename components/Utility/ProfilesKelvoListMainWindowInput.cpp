@@ -124,14 +124,13 @@ void ProfilesKelvoListMainWindow::OnKeyDown(wxKeyEvent& event)
     case WXK_PAGEUP:
     case WXK_NUMPAD_PAGEUP:
         // First to the top of the page, then a page further, keeping one row in view.
-        target = (current > m_topItem) ? m_topItem : std::max(0L, current - (page - 1));
+        target = (current < 0 || current > m_topItem) ? m_topItem : std::max(0L, current - (page - 1));
         break;
     case WXK_PAGEDOWN:
     case WXK_NUMPAD_PAGEDOWN:
     {
         const long pageBottom = std::min(count - 1, m_topItem + page - 1);
-        target =
-            (current >= 0 && current < pageBottom) ? pageBottom : std::min(count - 1, current + (page - 1));
+        target = (current < pageBottom) ? pageBottom : std::min(count - 1, current + (page - 1));
         break;
     }
     case WXK_HOME:

@@ -150,6 +150,19 @@ TEST_F(ListInput, ShiftExtendsCtrlMovesTheFocusAloneAndCtrlAAll)
     EXPECT_EQ(SelectedItems(), (std::vector<long>{6}));
 }
 
+TEST_F(ListInput, PagesWithoutAFocusedRowStartFromThePage)
+{
+    Build(wxLC_SINGLE_SEL, 200);
+    const long page = m_rows->GetCountPerPage();
+    SendKey(m_rows, WXK_PAGEDOWN);
+    EXPECT_EQ(FocusedItem(), page - 1) << "the last row of the page";
+    m_list->SetItemState(page - 1, 0, wxLIST_STATE_FOCUSED | wxLIST_STATE_SELECTED);
+    ASSERT_EQ(FocusedItem(), -1);
+    m_rows->ScrollToTop(50);
+    SendKey(m_rows, WXK_PAGEUP);
+    EXPECT_EQ(FocusedItem(), 50) << "the first row of the page";
+}
+
 TEST_F(ListInput, CtrlADoesNothingInASingleSelectionList)
 {
     Build(wxLC_SINGLE_SEL, 5);
