@@ -128,7 +128,10 @@ void ProfilesKelvoListMainWindow::DrawRow(wxDC& dc, long item, const wxRect& row
                                           bool odd) const
 {
     const Theme& theme = Themer::GetThemeService()->GetTheme("ListControl");
-    const ProfilesKelvoListLineData line = GetLine(item);
+    // Stored rows are drawn in place; virtual ones are built from the callbacks.
+    const ProfilesKelvoListLineData* stored = GetStoredLine(item);
+    const ProfilesKelvoListLineData built = stored ? ProfilesKelvoListLineData() : GetLine(item);
+    const ProfilesKelvoListLineData& line = stored ? *stored : built;
     const int clientWidth = GetClientSize().GetWidth();
     const int top = rowRect.GetTop();
 
