@@ -92,8 +92,9 @@ public:
     // Delivers what was queued and returns how many updates arrived in all.
     int Delivered()
     {
-        // A handler delivers one event per call; the application drains them all.
-        wxTheApp->ProcessPendingEvents();
+        // A handler delivers one event per call; the application drains them
+        // all. A console application: wxTheApp would take it for a GUI one.
+        wxAppConsole::GetInstance()->ProcessPendingEvents();
         return m_count;
     }
     int LastId() const { return m_lastId; }
