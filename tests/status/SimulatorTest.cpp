@@ -2,6 +2,11 @@
 
 #include <map>
 #include <set>
+#include <string>
+
+#include <csignal>
+#include <sys/wait.h>
+#include <unistd.h>
 
 #include <wx/dir.h>
 #include <wx/ffile.h>
@@ -175,5 +180,50 @@ TEST(Simulator, AStopRequestEndsTheRunBetweenTwoWholeOperations)
         EXPECT_EQ(Pieces(line).size(), 9u) << line;
     EXPECT_EQ(status.Parse(), 1);
 }
+
+#ifdef WYX_SIMULATOR_TOOL
+// The program itself: started in a fresh system root, stopped by SIGTERM once
+// it has said where it writes.
+TEST(SimulatorProgram, StopsCleanlyOnSigterm)
+{
+    SystemRoot root;
+    int output[2];
+    ASSERT_EQ(pipe(output), 0);
+    const pid_t child = fork();
+    if (child == 0)
+    {
+        dup2(output[1], STDOUT_FILENO);
+        close(output[0]);
+        close(output[1]);
+        execl(WYX_SIMULATOR_TOOL, WYX_SIMULATOR_TOOL, "--rate", "50/s", "--duration", "3600",
+              "--step-seconds", "0.01", static_cast<char*>(nullptr));
+        _exit(127);
+    }
+    close(output[1]);
+    ASSERT_GT(child, 0);
+    std::string said;
+    char c = 0;
+    while (said.find('\n') == std::string::npos && read(output[0], &c, 1) == 1)
+        said += c;
+    EXPECT_NE(said.find("writing to"), std::string::npos) << said;
+    kill(child, SIGTERM);
+    while (read(output[0], &c, 1) == 1)
+        said += c;
+    close(output[0]);
+    int status = 0;
+    ASSERT_EQ(waitpid(child, &status, 0), child);
+    ASSERT_TRUE(WIFEXITED(status)) << said;
+    EXPECT_EQ(WEXITSTATUS(status), 0) << said;
+    EXPECT_NE(said.find("(stopped)"), std::string::npos) << said;
+
+    for (const wxString& line : ReadJournal(GetDataDirectory() + "TiveraJobsStatusFile.txt"))
+        EXPECT_EQ(Pieces(line).size(), 9u) << line;
+    for (const wxString& line : ReadJournal(GetDataDirectory() + "TiveraJobsLogFile.txt"))
+        EXPECT_EQ(Pieces(line).size(), 8u) << line;
+    wxArrayString hotFolders;
+    WyxDataSource::GetInstance().GetHotFoldersList(hotFolders);
+    EXPECT_FALSE(hotFolders.empty());
+}
+#endif
 
 } // namespace
