@@ -71,6 +71,16 @@ std::string FolderOf(const std::string& path)
     return slash == 0 ? "/" : path.substr(0, slash);
 }
 
+// Only root may give a file away; for anyone else this fails harmlessly, or
+// keeps just the group, and the journal then belongs to its writer.
+bool GiveOwnership(int fd, const struct stat& original)
+{
+    if (original.st_uid == ::geteuid() && original.st_gid == ::getegid())
+        return true;
+    return ::fchown(fd, original.st_uid, original.st_gid) == 0 ||
+           ::fchown(fd, static_cast<uid_t>(-1), original.st_gid) == 0;
+}
+
 void SyncFolder(const std::string& folder)
 {
     // Makes the rename itself durable; a file system that cannot sync a
@@ -131,12 +141,8 @@ bool ReplaceFileContents(const wxString& path, const std::string& bytes)
     bool written = WriteAll(fd.Get(), bytes.data(), bytes.size());
     if (written)
     {
-        // Only root may give the file away; for anyone else this fails
-        // harmlessly and the journal then belongs to its writer. The owner
-        // goes first because a change of owner clears set-id mode bits.
-        if (original.st_uid != ::geteuid() || original.st_gid != ::getegid())
-            if (::fchown(fd.Get(), original.st_uid, original.st_gid) != 0)
-                ::fchown(fd.Get(), static_cast<uid_t>(-1), original.st_gid);
+        // The owner goes first because a change of owner clears set-id bits.
+        GiveOwnership(fd.Get(), original);
         ::fchmod(fd.Get(), original.st_mode & 07777);
         written = ::fsync(fd.Get()) == 0;
     }
