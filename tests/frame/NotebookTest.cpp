@@ -5,6 +5,7 @@
 
 #include "ColourPrint.h"
 #include "GuiTest.h"
+#include "ScreenGrab.h"
 #include "Settle.h"
 
 #include <gtest/gtest.h>
@@ -299,6 +300,24 @@ TEST_F(NotebookTest, DrawsTheSelectedTabInItsStateColourAndTheOthersIdle)
     strip = RenderStrip();
     EXPECT_EQ(Pixel(strip, FillPoint(tabs[0])), kStrip);
     EXPECT_EQ(Pixel(strip, FillPoint(tabs[1])), kPage);
+}
+
+// What the strip's paint handler put on the display, read back from the screen.
+TEST_F(NotebookTest, ThePaintedStripShowsTheSelectedTabInItsColour)
+{
+    wxWindow* strip = book->GetTabStrip();
+    const wxRect onScreen(strip->ClientToScreen(wxPoint(0, 0)), strip->GetClientSize());
+    const std::vector<wxRect> tabs = book->GetTabRects();
+    const auto shows = [&](int tab, const wxColour& colour)
+    {
+        const wxImage screen = GrabScreen(onScreen);
+        return screen.IsOk() && Pixel(screen, FillPoint(tabs[tab])) == colour;
+    };
+    // The toolkit paints on its own schedule.
+    EXPECT_TRUE(PumpUntil([&] { return shows(0, kPage) && shows(1, kStrip); }));
+
+    ClickTab(1);
+    EXPECT_TRUE(PumpUntil([&] { return shows(0, kStrip) && shows(1, kPage); }));
 }
 
 TEST_F(NotebookTest, TheSelectedTabOpensOntoItsPage)
