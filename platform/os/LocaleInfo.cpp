@@ -20,7 +20,7 @@ constexpr const wchar_t* kTimeLetters = L"Hhmst";
 
 struct Conversion
 {
-    wchar_t spec;
+    wchar_t letter;
     PatternKind kind;
     const wchar_t* letters;
 };
@@ -42,10 +42,10 @@ constexpr Conversion kUnpadded[] = {
     {L'I', PatternKind::Time, L"h"}, {L'M', PatternKind::Time, L"m"}, {L'S', PatternKind::Time, L"s"},
 };
 
-const Conversion* FindConversion(const Conversion* begin, const Conversion* end, wchar_t spec)
+const Conversion* FindConversion(const Conversion* begin, const Conversion* end, wchar_t letter)
 {
     for (const Conversion* c = begin; c != end; ++c)
-        if (c->spec == spec)
+        if (c->letter == letter)
             return c;
     return nullptr;
 }
@@ -62,8 +62,8 @@ bool ExpandComposites(const wxString& format, const wxString& amPmFormat, bool a
             expanded += c;
             continue;
         }
-        const wchar_t spec = format[++i];
-        switch (spec)
+        const wchar_t letter = format[++i];
+        switch (letter)
         {
         case L'D':
             expanded += L"%m/%d/%y";
@@ -85,7 +85,7 @@ bool ExpandComposites(const wxString& format, const wxString& amPmFormat, bool a
             break;
         default:
             expanded += L'%';
-            expanded += spec;
+            expanded += letter;
             break;
         }
     }
@@ -150,23 +150,23 @@ bool ConvertStrftimePattern(const wxString& format, PatternKind kind, const wxSt
         }
         if (i + 1 >= expanded.length())
             return false;
-        wchar_t spec = expanded[++i];
+        wchar_t letter = expanded[++i];
         const Conversion* conversion = nullptr;
-        if (spec == L'%' || spec == L'n' || spec == L't')
+        if (letter == L'%' || letter == L'n' || letter == L't')
         {
-            result += spec == L'%' ? L'%' : spec == L'n' ? L'\n' : L'\t';
+            result += letter == L'%' ? L'%' : letter == L'n' ? L'\n' : L'\t';
             continue;
         }
-        if (spec == L'-')
+        if (letter == L'-')
         {
             if (i + 1 >= expanded.length())
                 return false;
-            spec = expanded[++i];
-            conversion = FindConversion(std::begin(kUnpadded), std::end(kUnpadded), spec);
+            letter = expanded[++i];
+            conversion = FindConversion(std::begin(kUnpadded), std::end(kUnpadded), letter);
         }
         else
         {
-            conversion = FindConversion(std::begin(kConversions), std::end(kConversions), spec);
+            conversion = FindConversion(std::begin(kConversions), std::end(kConversions), letter);
         }
         if (conversion == nullptr || conversion->kind != kind)
             return false;
