@@ -419,3 +419,49 @@ TEST_F(ListInput, AutosizeFitsTheWidestCellOrTheLabel)
     EXPECT_FALSE(m_list->SetColumnWidth(5, 10)) << "no such column";
 }
 } // namespace
+
+namespace
+{
+TEST_F(ListInput, RightClickSelectsTheRowThenReportsIt)
+{
+    Build(wxLC_SINGLE_SEL, 5);
+    Click(1);
+    m_events->Take();
+    const int lh = m_rows->GetLineHeight();
+    SendMouse(m_rows, wxEVT_RIGHT_DOWN, 50, 3 * lh + lh / 2);
+    EXPECT_EQ(m_events->Take(), (Events{Deselected(1), Focused(3), Selected(3),
+                                        EventRecord{wxEVT_LIST_ITEM_RIGHT_CLICK, 3, -1}}));
+}
+
+TEST_F(ListInput, ItemsKeepTheirTextsImagesDataAndState)
+{
+    Build(wxLC_SINGLE_SEL, 0);
+    EXPECT_EQ(m_list->InsertItem(0, wxString(), 0), 0);
+    EXPECT_EQ(m_list->InsertItem(1, wxS("second")), 1);
+    EXPECT_EQ(m_list->InsertItem(99, wxS("appended")), 2) << "an index past the end appends";
+    EXPECT_TRUE(m_list->SetItem(0, 1, wxS("cell")));
+    EXPECT_FALSE(m_list->SetItem(7, 1, wxS("no such row")));
+    EXPECT_TRUE(m_list->SetItemData(0, 42));
+    m_list->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
+
+    wxListItem info;
+    info.SetId(0);
+    info.SetColumn(1);
+    info.SetMask(wxLIST_MASK_TEXT | wxLIST_MASK_DATA | wxLIST_MASK_STATE | wxLIST_MASK_IMAGE);
+    info.SetStateMask(wxLIST_STATE_SELECTED);
+    ASSERT_TRUE(m_list->GetItem(info));
+    EXPECT_EQ(info.GetText(), wxS("cell"));
+    EXPECT_EQ(info.GetData(), 42u);
+    EXPECT_EQ(info.GetState(), wxLIST_STATE_SELECTED);
+    EXPECT_EQ(info.GetImage(), -1) << "column 1 has no image of its own";
+    info.SetColumn(0);
+    ASSERT_TRUE(m_list->GetItem(info));
+    EXPECT_EQ(info.GetImage(), 0);
+    EXPECT_EQ(m_list->GetItemData(0), 42u);
+    EXPECT_EQ(m_list->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED), 0);
+    EXPECT_EQ(m_list->GetSelectedItemCount(), 1);
+    EXPECT_EQ(m_list->GetItemText(2), wxS("appended"));
+    info.SetId(3);
+    EXPECT_FALSE(m_list->GetItem(info)) << "no such row";
+}
+} // namespace
