@@ -7,10 +7,10 @@
 // What the command line of wyx-simulator asks for.
 struct SimulatorOptions
 {
-    double jobsPerSecond = 0.2;
+    double jobsPerSecond = 0.5;
     double durationSeconds = 60;
     double failureShare = 0.2;
-    double stepSeconds = 1.5; // mean time a job spends in each stage
+    double stepSeconds = 2.0; // mean time a job spends in each stage
     std::uint32_t seed = 0;
     bool seedGiven = false;
     wxString dataDirectory; // empty: the program's data directory
