@@ -185,6 +185,8 @@ wxWindow* CNOwnerDrawNotebook::DoRemovePage(size_t n)
         return nullptr;
 
     wxWindow* page = m_pages[n];
+    // A page taken out (not deleted) must not stay drawn over its successor.
+    page->Hide();
     m_pages.erase(m_pages.begin() + n);
     m_tabs.erase(m_tabs.begin() + n);
     m_hoverTab = wxNOT_FOUND;

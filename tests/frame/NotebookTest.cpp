@@ -431,6 +431,16 @@ TEST_F(NotebookTest, RemovingPagesKeepsTheSelectionOnTheSamePageOrItsNeighbour)
     EXPECT_FALSE(book->DeletePage(0));
 }
 
+TEST_F(NotebookTest, ASelectedPageTakenOutIsHiddenAndItsNeighbourShown)
+{
+    ASSERT_TRUE(book->RemovePage(0));
+    EXPECT_FALSE(pages[0]->IsShown());
+    EXPECT_TRUE(pages[1]->IsShown());
+    EXPECT_EQ(book->GetSelection(), 0);
+    EXPECT_EQ(book->GetCurrentPage(), pages[1]);
+    pages[0]->Destroy();
+}
+
 TEST_F(NotebookTest, InsertingBeforeTheSelectionKeepsTheSamePageSelected)
 {
     book->ChangeSelection(1);
