@@ -79,6 +79,19 @@ public:
         return *m_status;
     }
 
+    // How the process ended, for failure messages.
+    std::string Outcome()
+    {
+        if (!HasEnded())
+            return "still running";
+        const int status = *m_status;
+        if (WIFEXITED(status))
+            return "ended with exit code " + std::to_string(WEXITSTATUS(status));
+        if (WIFSIGNALED(status))
+            return "ended by signal " + std::to_string(WTERMSIG(status));
+        return "ended with wait status " + std::to_string(status);
+    }
+
     bool HasEnded()
     {
         int status = 0;
@@ -332,7 +345,7 @@ TEST_F(ProgramTest, OpensTheTitledWindowAndEndsCleanlyWhenItIsClosed)
 {
     Program program(Environment("home"));
     const Window window = x.WaitForWindow(program);
-    ASSERT_NE(window, 0u) << "the program ended without a window";
+    ASSERT_NE(window, 0u) << "no window: the program " << program.Outcome();
 
     EXPECT_EQ(x.Title(window), kTitle);
     const XWindowAttributes attributes = x.Attributes(window);
@@ -347,7 +360,7 @@ TEST_F(ProgramTest, ASecondCopyOfTheSameUserEndsAtOnceWithoutAWindow)
     const std::vector<std::string> environment = Environment("home");
     Program first(environment);
     const Window window = x.WaitForWindow(first);
-    ASSERT_NE(window, 0u);
+    ASSERT_NE(window, 0u) << "no window: the program " << first.Outcome();
 
     Program second(environment);
     // A copy that opened its window would wait for the user; this one ends first.
@@ -368,11 +381,11 @@ TEST_F(ProgramTest, AnotherUserRunsItsOwnCopyBesideTheFirst)
         GTEST_SKIP() << "starting a copy as another user needs root";
     Program first(Environment("home"));
     const Window firstWindow = x.WaitForWindow(first);
-    ASSERT_NE(firstWindow, 0u);
+    ASSERT_NE(firstWindow, 0u) << "no window: the program " << first.Outcome();
 
     Program other(Environment("other-home", kOtherUser), kOtherUser, InstalledCopy().string());
     const Window otherWindow = x.WaitForWindow(other);
-    ASSERT_NE(otherWindow, 0u) << "the other user's copy ended without a window";
+    ASSERT_NE(otherWindow, 0u) << "no window: the program " << other.Outcome();
     EXPECT_EQ(x.Title(otherWindow), kTitle);
 
     CloseAndExpectCleanExit(other, otherWindow);
@@ -386,7 +399,7 @@ TEST_F(ProgramTest, TheCrashReporterIsInstalledAtStartAndUninstalledAtExit)
                  "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=" + libraryFolder + "\n");
     Program program(Environment("home"));
     const Window window = x.WaitForWindow(program);
-    ASSERT_NE(window, 0u);
+    ASSERT_NE(window, 0u) << "no window: the program " << program.Outcome();
     EXPECT_EQ(CrashCalls(), "install\n");
     CloseAndExpectCleanExit(program, window);
     EXPECT_EQ(CrashCalls(), "install\nuninstall\n");
@@ -399,7 +412,7 @@ TEST_F(ProgramTest, AReporterLackingAnEntryIsNeverCalled)
                  "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=" + libraryFolder + "\n");
     Program program(Environment("home"));
     const Window window = x.WaitForWindow(program);
-    ASSERT_NE(window, 0u);
+    ASSERT_NE(window, 0u) << "no window: the program " << program.Outcome();
     CloseAndExpectCleanExit(program, window);
     EXPECT_EQ(CrashCalls(), "");
 }
