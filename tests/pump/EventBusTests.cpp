@@ -81,10 +81,13 @@ TEST(EventBusChannels, AnAddedChannelCarriesEvents)
 {
     std::vector<int> trace;
     RecordingHandler handler(1, trace);
-    ASSERT_TRUE(EventBus::Get().AddChannel(ChannelKey(41)));
-    EXPECT_FALSE(EventBus::Get().AddChannel(ChannelKey(41)));
-    ASSERT_TRUE(EventBus::Get().Subscribe(ChannelKey(41), &handler));
-    EXPECT_TRUE(EventBus::Get().Publish(ChannelKey(41), StatusUpdate()));
+    // Channels live as long as the process: a repeated run needs a new id.
+    static int nextId = 41;
+    const ChannelKey key(nextId++);
+    ASSERT_TRUE(EventBus::Get().AddChannel(key));
+    EXPECT_FALSE(EventBus::Get().AddChannel(key));
+    ASSERT_TRUE(EventBus::Get().Subscribe(key, &handler));
+    EXPECT_TRUE(EventBus::Get().Publish(key, StatusUpdate()));
     DeliverPendingEvents();
     EXPECT_EQ(trace.size(), 1u);
 }
