@@ -7,6 +7,11 @@ find_package(GTest REQUIRED)
 
 set(WYX_FUZZ_SECONDS 10 CACHE STRING "How long each fuzz target runs as a test")
 
+# GUI tests share one display, its pointer and its keyboard focus: they run one
+# at a time (the unit tests still run beside them).
+set(WYX_GUI_TEST_PROPERTIES LABELS gui RESOURCE_LOCK display TIMEOUT 300
+    ENVIRONMENT NO_AT_BRIDGE=1)
+
 function(wyx_unit_test name)
     cmake_parse_arguments(T "" "" "SOURCES;LIBS" ${ARGN})
     add_executable(${name} ${T_SOURCES})
@@ -22,8 +27,7 @@ function(wyx_gui_test name)
     add_executable(${name} ${T_SOURCES} ${PROJECT_SOURCE_DIR}/tests/support/GuiTestMain.cpp)
     target_include_directories(${name} PRIVATE ${PROJECT_SOURCE_DIR}/tests/support)
     target_link_libraries(${name} PRIVATE ${T_LIBS} wx::core GTest::gtest)
-    gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST PROPERTIES LABELS gui TIMEOUT 300
-                         ENVIRONMENT "NO_AT_BRIDGE=1;GDK_BACKEND=x11")
+    gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST PROPERTIES ${WYX_GUI_TEST_PROPERTIES})
 endfunction()
 
 function(wyx_fuzz_target name)
