@@ -38,7 +38,7 @@ public:
 
     // A handler's own ProcessPendingEvents handles one event a call; the
     // application delivers all of them, as the program's event loop does.
-    void Deliver() { wxTheApp->ProcessPendingEvents(); }
+    void Deliver() { wxAppConsole::GetInstance()->ProcessPendingEvents(); }
 
     int logUpdates = 0;
     int statusUpdates = 0;
