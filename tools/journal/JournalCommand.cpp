@@ -28,6 +28,9 @@ const char* const kUsage =
     "\n"
     "LINE is the fields without the tag, separated by TABs, given as one argument;\n"
     "its first field is the key. Keys compare exactly, trailing blanks ignored.\n"
+    "An ARGUMENT of \"-\" reads one argument a line from standard input and runs\n"
+    "the operation once for each, each under the lock, stopping at the first\n"
+    "failure; a producer can so append many jobs without a process for each.\n"
     "No operation creates a journal: on a missing journal, add (like every other\n"
     "operation) changes nothing and exits with 1. Create it first, e.g. with touch.\n"
     "The journal's lock is waited for as long as another process holds it.\n"
@@ -65,6 +68,7 @@ struct Command
     wxString journal;
     Operation operation = Operation::Read;
     wxString argument;
+    bool argumentsFromInput = false;
 };
 
 int UsageError(std::FILE* err, const wxString& problem)
@@ -83,6 +87,19 @@ wxString JournalPath(const wxString& journal)
         return GetDataDirectory() + "TiveraJobsLogFile.txt";
     if (journal.Contains("/"))
         return journal;
+    return wxString();
+}
+
+// Takes one ARGUMENT into command, or returns what is wrong with it.
+wxString CheckArgument(const std::string& raw, Command& command)
+{
+    command.argument = wxString::FromUTF8(raw.data(), raw.size());
+    if (command.argument.empty() && !raw.empty())
+        return "the argument is not valid UTF-8";
+    if (command.argument.find_first_of("\r\n") != wxString::npos)
+        return "the argument must be a single line";
+    if (command.operation != Operation::Add && command.argument.empty())
+        return "the key must not be empty";
     return wxString();
 }
 
@@ -113,15 +130,12 @@ wxString Parse(int argc, const char* const* argv, Command& command)
     if (!found->takesArgument)
         return wxString();
 
-    const std::string raw = argv[3];
-    command.argument = wxString::FromUTF8(raw.data(), raw.size());
-    if (command.argument.empty() && !raw.empty())
-        return "the argument is not valid UTF-8";
-    if (command.argument.find_first_of("\r\n") != wxString::npos)
-        return "the argument must be a single line";
-    if (command.operation != Operation::Add && command.argument.empty())
-        return "the key must not be empty";
-    return wxString();
+    if (std::string(argv[3]) == "-")
+    {
+        command.argumentsFromInput = true;
+        return wxString();
+    }
+    return CheckArgument(argv[3], command);
 }
 
 int Run(const Command& command, std::FILE* out)
@@ -184,9 +198,39 @@ void ReportFailure(std::FILE* err, int result, const wxString& journal)
     std::fprintf(err, "wyx-journal: %s: %s\n", static_cast<const char*>(journal.utf8_str()), problem);
 }
 
+// One operation per line of input ("\n" or "\r\n" ends a line).
+int RunForEachInputLine(Command command, std::FILE* in, std::FILE* out, std::FILE* err)
+{
+    std::string line;
+    int character;
+    bool more = true;
+    while (more)
+    {
+        line.clear();
+        while ((character = std::fgetc(in)) != EOF && character != '\n')
+            line.push_back(static_cast<char>(character));
+        more = character != EOF;
+        if (!line.empty() && line.back() == '\r')
+            line.pop_back();
+        if (line.empty() && !more)
+            break;
+        const wxString problem = CheckArgument(line, command);
+        if (!problem.empty())
+            return UsageError(err, problem);
+        const int result = Run(command, out);
+        if (result != wyx::JobOk)
+        {
+            ReportFailure(err, result, command.journal);
+            return result;
+        }
+    }
+    std::fflush(out);
+    return wyx::JobOk;
+}
+
 } // namespace
 
-int RunJournalCommand(int argc, const char* const* argv, std::FILE* out, std::FILE* err)
+int RunJournalCommand(int argc, const char* const* argv, std::FILE* in, std::FILE* out, std::FILE* err)
 {
     if (argc == 2 && (wxString(argv[1]) == "--help" || wxString(argv[1]) == "-h"))
     {
@@ -197,6 +241,8 @@ int RunJournalCommand(int argc, const char* const* argv, std::FILE* out, std::FI
     const wxString problem = Parse(argc, argv, command);
     if (!problem.empty())
         return UsageError(err, problem);
+    if (command.argumentsFromInput)
+        return RunForEachInputLine(command, in, out, err);
     const int result = Run(command, out);
     ReportFailure(err, result, command.journal);
     std::fflush(out);

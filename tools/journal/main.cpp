@@ -8,5 +8,5 @@ int main(int argc, char** argv)
     wxInitializer initializer;
     if (!initializer.IsOk())
         return 1;
-    return RunJournalCommand(argc, argv, stdout, stderr);
+    return RunJournalCommand(argc, argv, stdin, stdout, stderr);
 }
