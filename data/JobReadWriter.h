@@ -11,10 +11,10 @@ namespace wyx
 // Results of the journal operations.
 enum JobResult : int
 {
-    JobOk = 0,           // done; also an empty path, where nothing is done
-    JobFileMissing = 1,  // the journal does not exist or cannot be opened or read
-    JobLockFailed = 2,   // the journal's lock was not obtained: nothing was read or changed
-    JobWriteFailed = 3,  // the new content could not be written; the journal is unchanged
+    JobOk = 0,          // done; also an empty path, where nothing is done
+    JobFileMissing = 1, // the journal does not exist or cannot be opened or read
+    JobLockFailed = 2,  // the journal's lock was not obtained: nothing was read or changed
+    JobWriteFailed = 3, // the new content could not be written; the journal is unchanged
 };
 
 // Access to one TAB-separated journal under its named lock. Every operation

@@ -12,7 +12,9 @@
 // alone; every key in the program has an empty name.
 struct ChannelKey
 {
-    ChannelKey(int channelId = 0, const wxString& channelName = wxString()) : name(channelName), id(channelId) {}
+    ChannelKey(int channelId = 0, const wxString& channelName = wxString()) : name(channelName), id(channelId)
+    {
+    }
 
     bool operator<(const ChannelKey& other) const { return id < other.id; }
 
