@@ -90,8 +90,8 @@ cmd_run() {
     mkdir -p "$XDG_CONFIG_HOME" "$XDG_RUNTIME_DIR" && chmod 700 "$XDG_RUNTIME_DIR"
     echo "== demo data in $demo (WYX_SYSTEM_ROOT)"
     "$bin/wyx-simulator" --duration 3600 &
-    local simulator=$!
-    trap 'kill $simulator 2>/dev/null || true' EXIT
+    SIMULATOR=$!
+    trap 'kill "$SIMULATOR" 2>/dev/null || true' EXIT
     sleep 1
     if [ -n "${DISPLAY:-}" ]; then
         "$bin/WyxProgress"
@@ -102,8 +102,9 @@ cmd_run() {
         xvfb-run -a -s "-screen 0 1024x768x24" bash -c '
             "$1" & app=$!
             sleep 8
-            import -window root "$2"
-            kill $app; wait $app' _ "$bin/WyxProgress" "$shot"
+            window=$(xdotool search --name "Status & Log" | head -n 1)
+            import -window "${window:-root}" "$2"
+            kill $app; wait $app || true' _ "$bin/WyxProgress" "$shot"
         echo "== screenshot of the window: $shot"
     fi
 }
