@@ -1,5 +1,8 @@
 #include "data/JournalText.h"
 
+#include <cstdint>
+#include <cstring>
+
 #include <wx/convauto.h>
 #include <wx/strconv.h>
 
@@ -205,28 +208,223 @@ template <typename Add> void SplitLines(const std::wstring& text, Add add)
         add(data + start, length - start, LineEnd::None);
 }
 
+// Strict UTF-8 as Unicode defines it: no overlong forms, no surrogates,
+// nothing beyond U+10FFFF, no sequence cut short.
+bool IsValidUtf8(const unsigned char* at, const unsigned char* end)
+{
+    while (at < end)
+    {
+        // Eight ASCII bytes at a time: journals are nearly all ASCII.
+        while (end - at >= 8)
+        {
+            std::uint64_t word;
+            std::memcpy(&word, at, sizeof word);
+            if (word & 0x8080808080808080ull)
+                break;
+            at += 8;
+        }
+        if (at == end)
+            break;
+        const unsigned char lead = *at;
+        if (lead < 0x80)
+        {
+            ++at;
+            continue;
+        }
+        std::size_t length;
+        unsigned char low = 0x80, high = 0xBF; // the range of the second byte
+        if (lead >= 0xC2 && lead <= 0xDF)
+            length = 2;
+        else if (lead >= 0xE0 && lead <= 0xEF)
+        {
+            length = 3;
+            if (lead == 0xE0)
+                low = 0xA0;
+            else if (lead == 0xED)
+                high = 0x9F;
+        }
+        else if (lead >= 0xF0 && lead <= 0xF4)
+        {
+            length = 4;
+            if (lead == 0xF0)
+                low = 0x90;
+            else if (lead == 0xF4)
+                high = 0x8F;
+        }
+        else
+            return false;
+        if (static_cast<std::size_t>(end - at) < length || at[1] < low || at[1] > high)
+            return false;
+        for (std::size_t i = 2; i < length; ++i)
+            if ((at[i] & 0xC0) != 0x80)
+                return false;
+        at += length;
+    }
+    return true;
+}
+
+// Decodes one line of UTF-8 already known to be valid; returns its length in
+// characters, which is never more than its length in bytes.
+std::size_t DecodeValidUtf8(const unsigned char* at, const unsigned char* end, wchar_t* out)
+{
+    wchar_t* const start = out;
+    while (at < end)
+    {
+        // Eight ASCII bytes at a time, as in the validation.
+        std::uint64_t word;
+        if (end - at >= 8 && (std::memcpy(&word, at, sizeof word), (word & 0x8080808080808080ull) == 0))
+        {
+            for (int i = 0; i < 8; ++i)
+                out[i] = at[i];
+            at += 8;
+            out += 8;
+            continue;
+        }
+        const unsigned char lead = *at;
+        if (lead < 0x80)
+        {
+            *out++ = lead;
+            ++at;
+        }
+        else if (lead < 0xE0)
+        {
+            *out++ = static_cast<wchar_t>(((lead & 0x1F) << 6) | (at[1] & 0x3F));
+            at += 2;
+        }
+        else if (lead < 0xF0)
+        {
+            *out++ = static_cast<wchar_t>(((lead & 0x0F) << 12) | ((at[1] & 0x3F) << 6) | (at[2] & 0x3F));
+            at += 3;
+        }
+        else
+        {
+            *out++ = static_cast<wchar_t>(((lead & 0x07) << 18) | ((at[1] & 0x3F) << 12) |
+                                          ((at[2] & 0x3F) << 6) | (at[3] & 0x3F));
+            at += 4;
+        }
+    }
+    return static_cast<std::size_t>(out - start);
+}
+
+// Lines end mostly in LF (CR LF): a bound to reserve for, found at memchr's speed.
+std::size_t CountLineFeeds(const char* at, const char* end)
+{
+    std::size_t feeds = 0;
+    while ((at = static_cast<const char*>(std::memchr(at, '\n', static_cast<std::size_t>(end - at)))) !=
+           nullptr)
+    {
+        ++feeds;
+        ++at;
+    }
+    return feeds;
+}
+
+// Calls add(text, length, end) for each line of a UTF-8 journal, decoding line
+// by line: the whole file is never held as wide text, which for journals of a
+// hundred thousand lines would double the memory a read touches. False, with
+// nothing added, when the bytes are not (all) UTF-8.
+template <typename Add> bool SplitUtf8Lines(const char* bytes, std::size_t size, Add add)
+{
+    const auto* at = reinterpret_cast<const unsigned char*>(bytes);
+    const auto* const end = at + size;
+    // The mark, and any repeat of it (a mark written twice), is no text.
+    static constexpr unsigned char kMark[] = {0xEF, 0xBB, 0xBF};
+    while (end - at >= 3 && std::memcmp(at, kMark, 3) == 0)
+        at += 3;
+    if (!IsValidUtf8(at, end))
+        return false;
+
+    std::wstring line;
+    auto addLine = [&](const unsigned char* start, const unsigned char* lineEnd, LineEnd ending)
+    {
+        const std::size_t byteLength = static_cast<std::size_t>(lineEnd - start);
+        if (line.size() < byteLength)
+            line.resize(byteLength);
+        add(line.data(), DecodeValidUtf8(start, lineEnd, &line[0]), ending);
+    };
+    // The next LF, then the first CR before it: each a vectorised scan. The LF
+    // found is kept while lines end in a lone CR, so a file of CR-ended lines
+    // is not searched to its end once per line.
+    const unsigned char* feed = nullptr;
+    bool feedKnown = false;
+    while (at < end)
+    {
+        if (!feedKnown || (feed != nullptr && feed < at))
+        {
+            feed =
+                static_cast<const unsigned char*>(std::memchr(at, '\n', static_cast<std::size_t>(end - at)));
+            feedKnown = true;
+        }
+        const unsigned char* const stop = feed != nullptr ? feed : end;
+        const auto* carriage =
+            static_cast<const unsigned char*>(std::memchr(at, '\r', static_cast<std::size_t>(stop - at)));
+        if (carriage != nullptr)
+        {
+            const bool pair = carriage + 1 == feed;
+            addLine(at, carriage, pair ? LineEnd::CrLf : LineEnd::Cr);
+            at = carriage + (pair ? 2 : 1);
+        }
+        else if (feed != nullptr)
+        {
+            addLine(at, feed, LineEnd::Lf);
+            at = feed + 1;
+        }
+        else
+        {
+            addLine(at, end, LineEnd::None);
+            at = end;
+        }
+    }
+    return true;
+}
+
+// Plain UTF-8 (with or without its mark) is read line by line; every other
+// form is decoded whole and split afterwards.
+template <typename Reserve, typename Add>
+bool SplitJournal(const char* bytes, std::size_t size, Reserve reserve, Add add)
+{
+    bool exact = true;
+    const wxBOM bom = size == 0 ? wxBOM_None : wxConvAuto::DetectBOM(bytes, size);
+    if (bom == wxBOM_None || bom == wxBOM_UTF8)
+    {
+        reserve(CountLineFeeds(bytes, bytes + size) + 1);
+        if (SplitUtf8Lines(bytes, size, add))
+            return true;
+    }
+    const std::wstring text = DecodeText(bytes, size, exact);
+    reserve(CountLineBreaks(text) + 1);
+    SplitLines(text, add);
+    return exact;
+}
+
 } // namespace
 
 DecodedJournal DecodeJournal(const char* bytes, std::size_t size)
 {
     DecodedJournal journal;
-    const std::wstring text = DecodeText(bytes, size, journal.exact);
-    journal.lines.reserve(CountLineBreaks(text) + 1);
-    SplitLines(text,
-               [&journal](const wchar_t* line, std::size_t length, LineEnd end) {
-                   journal.lines.push_back(JournalLine{wxString(line, length), end});
-               });
+    journal.exact = SplitJournal(
+        bytes, size, [&journal](std::size_t count) { journal.lines.reserve(count); },
+        [&journal](const wchar_t* line, std::size_t length, LineEnd end)
+        {
+            // Built in place: wxString has no move, so a pushed temporary is copied.
+            journal.lines.emplace_back();
+            journal.lines.back().text.assign(line, length);
+            journal.lines.back().end = end;
+        });
     return journal;
 }
 
 void DecodeJournalTexts(const char* bytes, std::size_t size, wxArrayString& lines)
 {
-    bool exact = true;
-    const std::wstring text = DecodeText(bytes, size, exact);
     lines.Clear();
-    lines.Alloc(CountLineBreaks(text) + 1);
-    SplitLines(text, [&lines](const wchar_t* line, std::size_t length, LineEnd)
-               { lines.Add(wxString(line, length)); });
+    SplitJournal(
+        bytes, size, [&lines](std::size_t count) { lines.Alloc(count); },
+        [&lines](const wchar_t* line, std::size_t length, LineEnd)
+        {
+            static const wxString empty;
+            lines.Add(empty);
+            lines.Last().assign(line, length);
+        });
 }
 
 std::string EncodeJournal(const std::vector<JournalLine>& lines)

@@ -151,6 +151,17 @@ INSTANTIATE_TEST_SUITE_P(
         // One invalid sequence sends the whole file to the single-byte fallback.
         BytesCase{"InvalidUtf8", "1\t\xC3\xA9\r\n2\t\xFF\r\n", {"1\t\xC3\x83\xC2\xA9", "2\t\xC3\xBF"}, true},
         BytesCase{"TruncatedUtf8Sequence", "1\tab\xE2\x82", {"1\tab\xC3\xA2\xC2\x82"}, true},
+        // An overlong "/" is no UTF-8: the file falls back to single bytes. Encoded
+        // surrogates and values beyond U+10FFFF are no characters: they read as
+        // U+FFFD, and a rewrite, which would lose them, is refused.
+        BytesCase{"OverlongUtf8", "1\t\xC0\xAF\r\n", {"1\t\xC3\x80\xC2\xAF"}, true},
+        BytesCase{"Utf8Surrogate", "\xED\xA0\x80", {"\xEF\xBF\xBD"}, false},
+        BytesCase{"Utf8BeyondUnicode", "\xF4\x90\x80\x80", {"\xEF\xBF\xBD"}, false},
+        // Long runs of ASCII are taken eight bytes at a time; what follows them must still decode.
+        BytesCase{"Utf8AfterLongAscii",
+                  "0123456789abcdef\xF0\x9F\x96\xA8\tKl\xC3\xB6ln 012345678\xE2\x82\xAC\r\nx",
+                  {"0123456789abcdef\xF0\x9F\x96\xA8\tKl\xC3\xB6ln 012345678\xE2\x82\xAC", "x"},
+                  true},
         BytesCase{"LoneByteThatStartsAMark", "\xFF", {"\xC3\xBF"}, true},
         BytesCase{"TwoBytesOfAUtf8Mark", "\xEF\xBB", {"\xC3\xAF\xC2\xBB"}, true},
         BytesCase{"MarkOnly", "\xEF\xBB\xBF", {}, true},
@@ -216,12 +227,13 @@ TEST_P(JournalLineEnds, SplitAtCrLfLfOrCrAndComeBackUnchanged)
 using E = wyx::LineEnd;
 INSTANTIATE_TEST_SUITE_P(
     Texts, JournalLineEnds,
-    ::testing::Values(SplitCase{"", {}, {}}, SplitCase{"a", {"a"}, {E::None}},
-                      SplitCase{"a\r\n", {"a"}, {E::CrLf}}, SplitCase{"\n", {""}, {E::Lf}},
-                      SplitCase{"a\n\rb", {"a", "", "b"}, {E::Lf, E::Cr, E::None}},
-                      SplitCase{"a\r\r\n", {"a", ""}, {E::Cr, E::CrLf}},
-                      SplitCase{"a\rb\nc\r\nd", {"a", "b", "c", "d"}, {E::Cr, E::Lf, E::CrLf, E::None}},
-                      SplitCase{"\r\n\r\n", {"", ""}, {E::CrLf, E::CrLf}}));
+    ::testing::Values(
+        SplitCase{"", {}, {}}, SplitCase{"a", {"a"}, {E::None}}, SplitCase{"a\r\n", {"a"}, {E::CrLf}},
+        SplitCase{"\n", {""}, {E::Lf}}, SplitCase{"a\n\rb", {"a", "", "b"}, {E::Lf, E::Cr, E::None}},
+        SplitCase{"a\r\r\n", {"a", ""}, {E::Cr, E::CrLf}},
+        SplitCase{"a\rb\nc\r\nd", {"a", "b", "c", "d"}, {E::Cr, E::Lf, E::CrLf, E::None}},
+        SplitCase{"\r\n\r\n", {"", ""}, {E::CrLf, E::CrLf}},
+        SplitCase{"a\rb\rc\r\nd\re", {"a", "b", "c", "d", "e"}, {E::Cr, E::Cr, E::CrLf, E::Cr, E::None}}));
 
 } // namespace
 } // namespace journaltest

@@ -1,5 +1,6 @@
-// Arbitrary bytes as a journal file: reading never fails or crashes, and a
-// journal that decodes exactly survives a rewrite line for line.
+// Arbitrary bytes as a journal file: reading never fails or crashes, valid
+// UTF-8 reads as the library's decoder reads it, and a journal that decodes
+// exactly survives a rewrite line for line.
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
@@ -8,6 +9,7 @@
 #include <string>
 
 #include <wx/init.h>
+#include <wx/strconv.h>
 
 #include "data/JobReadWriter.h"
 #include "data/JournalText.h"
@@ -56,6 +58,29 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     const wyx::DecodedJournal decoded = wyx::DecodeJournal(reinterpret_cast<const char*>(data), size);
     if (decoded.lines.size() != lines.size())
         std::abort();
+
+    // Valid UTF-8 reads as the library's own strict decoder reads it, split at
+    // the line ends; marks at the start are no text.
+    const char* const bytes = reinterpret_cast<const char*>(data);
+    if (wxConvUTF8.ToWChar(nullptr, 0, bytes, size) != wxCONV_FAILED)
+    {
+        wxString whole(bytes, wxConvUTF8, size);
+        while (whole.StartsWith(L"\uFEFF"))
+            whole.erase(0, 1);
+        // The library lets encoded surrogates and values beyond U+10FFFF through; the
+        // reader replaces them, which the encoding tests check.
+        for (wxUniChar c : whole)
+            if ((c.GetValue() >= 0xD800 && c.GetValue() <= 0xDFFF) || c.GetValue() > 0x10FFFF)
+                return 0;
+        wxString joined;
+        for (const wyx::JournalLine& line : decoded.lines)
+            joined += line.text + (line.end == wyx::LineEnd::CrLf ? "\r\n"
+                                   : line.end == wyx::LineEnd::Lf ? "\n"
+                                   : line.end == wyx::LineEnd::Cr ? "\r"
+                                                                  : "");
+        if (!decoded.exact || joined != whole)
+            std::abort();
+    }
 
     // What a writing operation would put in the file must read back as the
     // same lines, and write out again byte for byte (checked in memory: a
