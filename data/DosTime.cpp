@@ -1,12 +1,23 @@
 #include "data/DosTime.h"
 
 #include <cstdint>
+#include <string>
 
 namespace
 {
 
-void AppendNumber(wxString& out, unsigned value, bool twoDigits)
+// The walkers build into a std::wstring: appending to it is a store, where a
+// wxString append goes through the library's character handling each time,
+// and a status journal formats one time per line.
+void AppendNumber(std::wstring& out, unsigned value, bool twoDigits)
 {
+    if (value < 100 && (twoDigits || value >= 10))
+    {
+        const wchar_t pair[2] = {static_cast<wchar_t>(L'0' + value / 10),
+                                 static_cast<wchar_t>(L'0' + value % 10)};
+        out.append(pair, 2);
+        return;
+    }
     wchar_t digits[12];
     int count = 0;
     do
@@ -22,7 +33,7 @@ void AppendNumber(wxString& out, unsigned value, bool twoDigits)
 
 // Appends the number for a run of length 1 (bare) or 2 (two digits); longer
 // runs produce nothing.
-void AppendShortRun(wxString& out, size_t run, unsigned value)
+void AppendShortRun(std::wstring& out, size_t run, unsigned value)
 {
     if (run <= 2)
         AppendNumber(out, value, run == 2);
@@ -45,12 +56,17 @@ unsigned WeekDayOf(unsigned year, unsigned month, unsigned day)
     return (year + year / 4 - year / 100 + year / 400 + kOffsets[month - 1] + day) % 7;
 }
 
-size_t RunLength(const wxString& pattern, size_t start)
+size_t RunLength(const std::wstring& pattern, size_t start)
 {
     size_t end = start + 1;
     while (end < pattern.length() && pattern[end] == pattern[start])
         ++end;
     return end - start;
+}
+
+void AppendText(std::wstring& out, const wxString& text)
+{
+    out.append(text.wc_str(), text.length());
 }
 
 bool FieldsFromMoment(const wxDateTime& moment, CalendarFields& fields)
@@ -81,13 +97,18 @@ wxDateTime MomentFromFields(const CalendarFields& fields)
 
 bool DecodeDosTime(const wxString& dosTimeText, CalendarFields& fields)
 {
+    return DecodeDosTime(dosTimeText.wc_str(), dosTimeText.length(), fields);
+}
+
+bool DecodeDosTime(const wchar_t* dosTimeText, size_t length, CalendarFields& fields)
+{
     std::uint64_t value = 0;
-    for (wxString::const_iterator it = dosTimeText.begin(); it != dosTimeText.end(); ++it)
+    const wchar_t* digit = dosTimeText;
+    for (const wchar_t* const end = digit + length; digit != end; ++digit)
     {
-        const wxUniChar c = *it;
-        if (c < '0' || c > '9')
+        if (*digit < L'0' || *digit > L'9')
             break;
-        value = value * 10 + static_cast<unsigned>(c.GetValue() - '0');
+        value = value * 10 + static_cast<unsigned>(*digit - L'0');
         if (value > UINT32_MAX)
         {
             value = UINT32_MAX;
@@ -116,7 +137,7 @@ namespace
 
 // The walkers append to the caller's text, so that a whole "date, time" is
 // built in one string without temporaries.
-void AppendDate(wxString& out, const wxString& pattern, const CalendarFields& fields,
+void AppendDate(std::wstring& out, const std::wstring& pattern, const CalendarFields& fields,
                 const wyxos::LocaleNames& names)
 {
     const size_t monthIndex = (fields.month - 1) % 12;
@@ -131,17 +152,17 @@ void AppendDate(wxString& out, const wxString& pattern, const CalendarFields& fi
             if (run <= 2)
                 AppendShortRun(out, run, fields.month);
             else if (run == 3)
-                out += names.abbreviatedMonths[monthIndex];
+                AppendText(out, names.abbreviatedMonths[monthIndex]);
             else if (run == 4)
-                out += names.months[monthIndex];
+                AppendText(out, names.months[monthIndex]);
             break;
         case L'd':
             if (run <= 2)
                 AppendShortRun(out, run, fields.day);
             else if (run == 3)
-                out += names.abbreviatedDays[dayIndex];
+                AppendText(out, names.abbreviatedDays[dayIndex]);
             else if (run == 4)
-                out += names.days[dayIndex];
+                AppendText(out, names.days[dayIndex]);
             break;
         case L'y':
             if (run == 1)
@@ -159,7 +180,7 @@ void AppendDate(wxString& out, const wxString& pattern, const CalendarFields& fi
     }
 }
 
-void AppendTime(wxString& out, const wxString& pattern, const CalendarFields& fields,
+void AppendTime(std::wstring& out, const std::wstring& pattern, const CalendarFields& fields,
                 const wyxos::LocaleNames& names)
 {
     const wxString& designator = fields.hour < 12 ? names.am : names.pm;
@@ -183,9 +204,9 @@ void AppendTime(wxString& out, const wxString& pattern, const CalendarFields& fi
             break;
         case L't':
             if (run == 1 && !designator.empty())
-                out += designator[0];
+                out += designator.wc_str()[0];
             else if (run == 2)
-                out += designator;
+                AppendText(out, designator);
             break;
         default:
             out.append(run, c);
@@ -197,22 +218,22 @@ void AppendTime(wxString& out, const wxString& pattern, const CalendarFields& fi
 
 // Appends the date in the locale's pattern, or the library's %x when the
 // pattern cannot be read or yields nothing.
-void AppendLocaleDate(wxString& out, const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
+void AppendLocaleDate(std::wstring& out, const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
 {
     const size_t start = out.length();
     if (locale.hasDatePattern)
-        AppendDate(out, locale.datePattern, fields, locale.names);
+        AppendDate(out, locale.datePattern.ToStdWstring(), fields, locale.names);
     if (out.length() == start)
-        out += MomentFromFields(fields).Format("%x", wxDateTime::Local);
+        AppendText(out, MomentFromFields(fields).Format("%x", wxDateTime::Local));
 }
 
-void AppendLocaleTime(wxString& out, const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
+void AppendLocaleTime(std::wstring& out, const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
 {
     const size_t start = out.length();
     if (locale.hasTimePattern)
-        AppendTime(out, locale.timePattern, fields, locale.names);
+        AppendTime(out, locale.timePattern.ToStdWstring(), fields, locale.names);
     if (out.length() == start)
-        out += MomentFromFields(fields).Format("%X", wxDateTime::Local);
+        AppendText(out, MomentFromFields(fields).Format("%X", wxDateTime::Local));
 }
 
 } // namespace
@@ -220,44 +241,55 @@ void AppendLocaleTime(wxString& out, const CalendarFields& fields, const wyxos::
 wxString WalkDatePattern(const wxString& pattern, const CalendarFields& fields,
                          const wyxos::LocaleNames& names)
 {
-    wxString out;
-    AppendDate(out, pattern, fields, names);
-    return out;
+    std::wstring out;
+    AppendDate(out, pattern.ToStdWstring(), fields, names);
+    return wxString(out);
 }
 
 wxString WalkTimePattern(const wxString& pattern, const CalendarFields& fields,
                          const wyxos::LocaleNames& names)
 {
-    wxString out;
-    AppendTime(out, pattern, fields, names);
-    return out;
+    std::wstring out;
+    AppendTime(out, pattern.ToStdWstring(), fields, names);
+    return wxString(out);
 }
 
 wxString FormatLocaleDate(const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
 {
-    wxString out;
+    std::wstring out;
     AppendLocaleDate(out, fields, locale);
-    return out;
+    return wxString(out);
 }
 
 wxString FormatLocaleTime(const CalendarFields& fields, const wyxos::LocaleTimeInfo& locale)
 {
-    wxString out;
+    std::wstring out;
     AppendLocaleTime(out, fields, locale);
-    return out;
+    return wxString(out);
 }
 
-wxString FormatDosTime(const wxString& dosTimeText, const wyxos::LocaleTimeInfo& locale)
+namespace
+{
+
+wxString FormatDosTime(const wchar_t* dosTimeText, size_t length, const wyxos::LocaleTimeInfo& locale)
 {
     CalendarFields fields;
-    if (!DecodeDosTime(dosTimeText, fields))
+    if (!DecodeDosTime(dosTimeText, length, fields))
         return wxString();
-    wxString text;
-    text.reserve(32);
+    // Reused by each thread: the text is copied out once, at its final length.
+    thread_local std::wstring text;
+    text.clear();
     AppendLocaleDate(text, fields, locale);
     text += L", ";
     AppendLocaleTime(text, fields, locale);
-    return text;
+    return wxString(text);
+}
+
+} // namespace
+
+wxString FormatDosTime(const wxString& dosTimeText, const wyxos::LocaleTimeInfo& locale)
+{
+    return FormatDosTime(dosTimeText.wc_str(), dosTimeText.length(), locale);
 }
 
 const wyxos::LocaleTimeInfo& UserLocaleTimeInfo()
@@ -269,6 +301,11 @@ const wyxos::LocaleTimeInfo& UserLocaleTimeInfo()
 wxString FormatDosTime(const wxString& dosTimeText)
 {
     return FormatDosTime(dosTimeText, UserLocaleTimeInfo());
+}
+
+wxString FormatDosTime(const wchar_t* dosTimeText, size_t length)
+{
+    return FormatDosTime(dosTimeText, length, UserLocaleTimeInfo());
 }
 
 wxString FormatLocaleDate(const wxDateTime& moment)

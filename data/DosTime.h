@@ -10,6 +10,8 @@
 // that names no real moment (month 0, 31 February, 25 o'clock...) gives an
 // empty text rather than a made-up date.
 wxString FormatDosTime(const wxString& dosTimeText);
+// The same over characters where a line parser holds them, without a copy.
+wxString FormatDosTime(const wchar_t* dosTimeText, size_t length);
 
 // The date half and the time half of a moment, in the user's patterns; the
 // C library's %x / %X when a pattern cannot be read or yields nothing.
@@ -31,6 +33,7 @@ struct CalendarFields
 // Reads the leading decimal digits (none: 0; more than 32 bits: all ones) and
 // splits them as an MS-DOS date-time. False when they name no real moment.
 bool DecodeDosTime(const wxString& dosTimeText, CalendarFields& fields);
+bool DecodeDosTime(const wchar_t* dosTimeText, size_t length, CalendarFields& fields);
 
 // The pattern walkers: a run of one repeated letter is one item, every other
 // character is copied unchanged (quotes included). Runs without a meaning and

@@ -91,13 +91,14 @@ int JobStatusManager::Parse()
 
     std::vector<JobRecord> jobs;
     jobs.reserve(lines.size());
-    JobRecord record;
     for (const wxString& line : lines)
     {
         if (!m_running)
             break;
-        if (ParseStatusLine(line, record))
-            jobs.push_back(std::move(record));
+        // Parsed where it is kept: a JobRecord moved is a JobRecord copied.
+        jobs.emplace_back();
+        if (!ParseStatusLine(line, jobs.back()))
+            jobs.pop_back();
     }
 
     {

@@ -25,10 +25,10 @@ enum Piece : size_t
 
 // Piece boundaries into the line; stops as soon as a tenth piece shows up,
 // since such a line is skipped anyway.
-size_t SplitPieces(const wxString& line, std::array<std::pair<size_t, size_t>, kStatusPieces>& pieces)
+size_t SplitPieces(const wchar_t* line, size_t length,
+                   std::array<std::pair<size_t, size_t>, kStatusPieces>& pieces)
 {
     size_t count = 0;
-    const size_t length = line.length();
     size_t i = 0;
     while (i < length)
     {
@@ -37,8 +37,8 @@ size_t SplitPieces(const wxString& line, std::array<std::pair<size_t, size_t>, k
         if (i == length)
             break;
         const size_t start = i;
-        while (i < length && line[i] != L'\t')
-            ++i;
+        const wchar_t* const tab = std::wmemchr(line + i, L'\t', length - i);
+        i = tab != nullptr ? static_cast<size_t>(tab - line) : length;
         if (count == kStatusPieces)
             return kStatusPieces + 1;
         pieces[count++] = {start, i - start};
@@ -50,13 +50,12 @@ size_t SplitPieces(const wxString& line, std::array<std::pair<size_t, size_t>, k
 
 bool ParseStatusLine(const wxString& line, JobRecord& record)
 {
+    // Split in place over the characters: copies are made only of the pieces kept.
+    const wchar_t* const text = line.wc_str();
     std::array<std::pair<size_t, size_t>, kStatusPieces> pieces;
-    if (SplitPieces(line, pieces) != kStatusPieces)
+    if (SplitPieces(text, line.length(), pieces) != kStatusPieces)
         return false;
-    auto piece = [&](Piece p) { return line.substr(pieces[p].first, pieces[p].second); };
-
-    // Compared in place: a narrow literal or a copy would cost an allocation per line.
-    const wchar_t* action = line.wc_str() + pieces[Action].first;
+    const wchar_t* action = text + pieces[Action].first;
     const size_t actionLength = pieces[Action].second;
     auto isAction = [&](const wchar_t* tag)
     {
@@ -74,13 +73,17 @@ bool ParseStatusLine(const wxString& line, JobRecord& record)
     if (!isAction(L"ADDED") && !isAction(L"MODIFIED"))
         return false;
 
-    record[StatusField::Key] = piece(Key);
-    record[StatusField::FilePath] = piece(FilePath);
-    record[StatusField::HotFolderPath] = piece(HotFolderPath);
-    record[StatusField::Server] = piece(Server);
-    record[StatusField::Size] = piece(Size);
-    record[StatusField::Format] = piece(Format);
-    record[StatusField::TimeText] = FormatDosTime(piece(DosTime));
-    record[StatusField::Status] = piece(Status);
+    // Assigned in place: each field is one allocation at most (wxString has no move).
+    auto take = [&](size_t field, Piece from)
+    { record[field].assign(text + pieces[from].first, pieces[from].second); };
+    take(StatusField::Key, Key);
+    take(StatusField::FilePath, FilePath);
+    take(StatusField::HotFolderPath, HotFolderPath);
+    take(StatusField::Server, Server);
+    take(StatusField::Size, Size);
+    take(StatusField::Format, Format);
+    wxString time = FormatDosTime(text + pieces[DosTime].first, pieces[DosTime].second);
+    record[StatusField::TimeText].swap(time);
+    take(StatusField::Status, Status);
     return true;
 }
