@@ -3,11 +3,13 @@
 #include <wx/log.h>
 
 #include "app/WyxProgressApp.h"
+#include "platform/os/HeapTuning.h"
 
 wxIMPLEMENT_APP_NO_MAIN(CWyxProgressApp);
 
 int main(int argc, char** argv)
 {
+    wyxos::TuneHeapForListRebuilds();
     // Before the application object exists, so that nothing the library does
     // while starting can assert or log below Info.
     wxDisableAsserts();
