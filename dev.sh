@@ -7,7 +7,7 @@ cd "$(dirname "$0")"
 ROOT=$PWD
 
 PACKAGES=(cmake ninja-build g++ clang libclang-rt-14-dev pkg-config libwxgtk3.2-dev
-          googletest libgtest-dev libbenchmark-dev libx11-dev xvfb xauth x11-utils xdotool imagemagick
+          libpango1.0-dev libcairo2-dev googletest libgtest-dev libbenchmark-dev libx11-dev xvfb xauth x11-utils xdotool imagemagick
           locales-all fonts-dejavu-core util-linux)
 
 install_missing() {

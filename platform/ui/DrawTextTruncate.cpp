@@ -1,4 +1,6 @@
 #include "platform/ui/DrawTextTruncate.h"
+#include "platform/ui/FontIdentity.h"
+#include "platform/ui/TextLayoutCache.h"
 
 #include <wx/arrstr.h>
 #include <wx/dynarray.h>
@@ -61,11 +63,10 @@ public:
     {
         wxCriticalSectionLocker lock(m_lock);
         const wxFont& font = dc.GetFont();
-        if (!(font == m_font))
-        {
+        if (!SameDrawingFont(font, m_font))
             m_entries.clear();
-            m_font = font;
-        }
+        // Kept even when alike, so that the next check is a pointer comparison.
+        m_font = font;
         if (m_entries.size() > kMaxEntries)
             m_entries.clear();
         wxString key = text;
@@ -90,6 +91,14 @@ TruncationMemo& Memo()
     // Never destroyed: fonts must not outlive the toolkit in a static destructor.
     static TruncationMemo* const memo = new TruncationMemo;
     return *memo;
+}
+// The shortened texts are drawn again at every repaint, as the cells that
+// fit are: their shaped layouts are kept too. Drawing happens on the GUI
+// thread only.
+TextLayoutCache& Layouts()
+{
+    static TextLayoutCache* const layouts = new TextLayoutCache;
+    return *layouts;
 }
 } // namespace
 
@@ -121,5 +130,5 @@ void DrawTextTruncate(wxDC& dc, const wxString& text, const wxRect& rect, int al
             return;
         }
     }
-    dc.DrawText(shown, x, rect.GetY());
+    Layouts().DrawText(dc, shown, x, rect.GetY());
 }
