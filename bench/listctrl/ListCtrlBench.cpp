@@ -180,6 +180,19 @@ template <typename Side> void VirtualRepaintPage(benchmark::State& state)
     state.counters["paints_per_op"] = benchmark::Counter(bench.Paints(), benchmark::Counter::kAvgIterations);
 }
 
+// The same window without rows: what the toolkit and the X server take for
+// any repaint of it, the floor under the figures above.
+template <typename Side> void EmptyRepaintPage(benchmark::State& state)
+{
+    Bench<Side> bench(wxLC_REPORT | wxLC_VIRTUAL | wxLC_HRULES | wxLC_VRULES, true);
+    bench.list->SetItemCount(0);
+    bench.Settle();
+    bench.ResetPaints();
+    for (auto _ : state)
+        bench.Repaint();
+    state.counters["paints_per_op"] = benchmark::Counter(bench.Paints(), benchmark::Counter::kAvgIterations);
+}
+
 // Our paint code alone, into an in-memory bitmap: what a repaint costs the
 // program, without the X server's share.
 void RenderPageIntoBitmap(benchmark::State& state)
@@ -246,6 +259,8 @@ BENCHMARK_TEMPLATE(VirtualSetItemCountAndRepaint, OurSide)->Unit(benchmark::kMil
 BENCHMARK_TEMPLATE(VirtualSetItemCountAndRepaint, WxSide)->Unit(benchmark::kMillisecond);
 BENCHMARK_TEMPLATE(VirtualRepaintPage, OurSide)->Unit(benchmark::kMillisecond);
 BENCHMARK_TEMPLATE(VirtualRepaintPage, WxSide)->Unit(benchmark::kMillisecond);
+BENCHMARK_TEMPLATE(EmptyRepaintPage, OurSide)->Unit(benchmark::kMillisecond);
+BENCHMARK_TEMPLATE(EmptyRepaintPage, WxSide)->Unit(benchmark::kMillisecond);
 BENCHMARK_TEMPLATE(VirtualScrollOnePage, OurSide)->Unit(benchmark::kMillisecond);
 BENCHMARK_TEMPLATE(VirtualScrollOnePage, WxSide)->Unit(benchmark::kMillisecond);
 BENCHMARK_TEMPLATE(InsertTenThousandRows, OurSide)->Unit(benchmark::kMillisecond);

@@ -61,7 +61,10 @@ void DrawListCellText(wxDC& dc, const wxString& text, int format, int x, int yMi
         textX = x + (width - extent.GetWidth());
     else if (format == wxLIST_FORMAT_CENTRE)
         textX = x + (width - extent.GetWidth()) / 2;
-    dc.DrawText(text, textX, y);
+    if (cache)
+        cache->Draw(dc, text, textX, y);
+    else
+        dc.DrawText(text, textX, y);
 }
 
 void DrawListStatusMark(wxDC& dc, int image, int x, int rowTop, const wxColour& fill)
@@ -209,21 +212,19 @@ void ProfilesKelvoListMainWindow::DrawRules(wxDC& dc, long firstVisible, long la
     if (!horizontal && !vertical)
         return;
 
+    // Rules are filled one pixel wide: cairo strokes a line centred on its
+    // coordinates, which the X server then rasterises as antialiased edges,
+    // while a pixel-aligned fill is a plain rectangle for it.
     const Theme& theme = Themer::GetThemeService()->GetTheme("ListControl");
-    dc.SetPen(wxPen(theme.lineColour, 1, wxPENSTYLE_SOLID));
+    dc.SetPen(*wxTRANSPARENT_PEN);
+    dc.SetBrush(wxBrush(theme.lineColour, wxBRUSHSTYLE_SOLID));
     const int clientWidth = GetClientSize().GetWidth();
     if (horizontal)
     {
         for (long item = firstVisible + 1; item <= lastVisible; ++item)
-        {
-            const int y = GetItemRect(item).GetTop();
-            dc.DrawLine(0, y, clientWidth, y);
-        }
+            dc.DrawRectangle(0, GetItemRect(item).GetTop(), clientWidth, 1);
         if (lastVisible == GetItemCount() - 1)
-        {
-            const int y = GetItemRect(lastVisible).GetTop() + m_lineHeight;
-            dc.DrawLine(0, y, clientWidth, y);
-        }
+            dc.DrawRectangle(0, GetItemRect(lastVisible).GetTop() + m_lineHeight, clientWidth, 1);
     }
     if (vertical)
     {
@@ -235,7 +236,7 @@ void ProfilesKelvoListMainWindow::DrawRules(wxDC& dc, long firstVisible, long la
             x += column.width;
             if (x - 2 >= clientWidth)
                 break;
-            dc.DrawLine(x - 2, top, x - 2, bottom);
+            dc.DrawRectangle(x - 2, top, 1, bottom - top);
         }
     }
 }
