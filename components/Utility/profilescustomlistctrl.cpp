@@ -34,9 +34,19 @@ bool ProfilesKelvoProfilesListCtrl::Create(const headerStyle* style, wxWindow* p
     if (style)
         m_headerStyle = std::make_unique<headerStyle>(*style);
 
+    // Colours and font of our own: without them every paint of the control
+    // and of its rows asks GTK for the defaults, which builds a style context
+    // each time, a third of what repainting an unchanged page costs.
+    const Theme& theme = Themer::GetThemeService()->GetTheme("ListControl");
+    SetOwnFont(GetFont());
+    SetOwnForegroundColour(theme.textColour);
+    SetOwnBackgroundColour(*wxWHITE);
+
     m_main = new ProfilesKelvoListMainWindow(this, wxID_ANY, listStyle);
     m_header = new ProfilesKelvoListHeaderWindow(this, m_main, m_headerStyle.get());
     m_main->SetFont(GetFont());
+    m_main->SetOwnForegroundColour(GetForegroundColour());
+    m_main->SetOwnBackgroundColour(GetBackgroundColour());
     LayoutChildren();
     SetInitialSize(size);
     return true;
