@@ -331,6 +331,9 @@ void JobLogManager::LayOutLines(const wxArrayString& lines, bool formatTimes,
                                 std::vector<LineLayout>& layouts, std::vector<wxString>& times) const
 {
     layouts.reserve(lines.size());
+    // Reserved in full: a growing vector of wxString copies every text it moves.
+    if (formatTimes)
+        times.reserve(lines.size());
     for (std::size_t i = 0; i < lines.size(); ++i)
     {
         if (!m_running.load())
@@ -341,7 +344,13 @@ void JobLogManager::LayOutLines(const wxArrayString& lines, bool formatTimes,
             continue;
         layout.added = PieceIsNoCase(lines[i].wc_str(), layout.pieces[ActionPiece], kAdded);
         if (formatTimes)
-            times.push_back(FormatDosTime(PieceText(lines[i], layout.pieces[DosTimePiece])));
+        {
+            // Swapped in: wxString has no move, and a pushed text is a copied text.
+            const PieceSpan& time = layout.pieces[DosTimePiece];
+            wxString formatted = FormatDosTime(lines[i].wc_str() + time.start, time.length);
+            times.emplace_back();
+            times.back().swap(formatted);
+        }
         layouts.push_back(layout);
     }
 }
@@ -377,18 +386,25 @@ bool JobLogManager::TakeIn(const wxArrayString& lines, const std::vector<LineLay
             continue;
         m_keys.insert(key);
 
+        // Assigned from the line in place: one allocation per field, where a
+        // temporary would be copied (wxString has no move).
         JobRecord& record = m_records.emplace_back();
-        record[LogField::Key] = PieceText(line, pieces[KeyPiece]);
-        record[LogField::FilePath] = PieceText(line, pieces[FilePiece]);
-        record[LogField::HotFolderPath] = PieceText(line, pieces[HotFolderPiece]);
-        record[LogField::Server] = PieceText(line, pieces[ServerPiece]);
-        record[LogField::Status] = PieceText(line, pieces[StatusPiece]);
-        record[LogField::Detail] = PieceText(line, pieces[DetailPiece]);
-        record[LogField::DosTime] = PieceText(line, pieces[DosTimePiece]);
+        auto take = [&](std::size_t field, std::size_t piece)
+        { record[field].assign(text + pieces[piece].start, pieces[piece].length); };
+        take(LogField::Key, KeyPiece);
+        take(LogField::FilePath, FilePiece);
+        take(LogField::HotFolderPath, HotFolderPiece);
+        take(LogField::Server, ServerPiece);
+        take(LogField::Status, StatusPiece);
+        take(LogField::Detail, DetailPiece);
+        take(LogField::DosTime, DosTimePiece);
         if (i < times.size())
             record[LogField::TimeText].swap(times[i]);
         else
-            record[LogField::TimeText] = FormatDosTime(record[LogField::DosTime]);
+        {
+            wxString formatted = FormatDosTime(record[LogField::DosTime]);
+            record[LogField::TimeText].swap(formatted);
+        }
         tookIn = true;
     }
     m_newEnd = m_firstSequence + m_records.size();

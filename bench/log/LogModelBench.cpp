@@ -16,6 +16,7 @@
 #include "data/DosTime.h"
 #include "data/JobLogManager.h"
 #include "data/JobReadWriter.h"
+#include "platform/os/HeapTuning.h"
 
 namespace
 {
@@ -220,6 +221,8 @@ BENCHMARK(BM_FormatDosTime);
 
 int main(int argc, char** argv)
 {
+    // As the program does at start.
+    wyxos::TuneHeapForListRebuilds();
     wxInitializer wx;
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();
