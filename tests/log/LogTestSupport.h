@@ -14,21 +14,13 @@
 #include <wx/string.h>
 #include <wx/utils.h>
 
+#include "SystemRoot.h"
 #include "data/DataLocations.h"
 
 namespace logtest
 {
 
-// Event queues need an application object; the unit tests have no window.
-class WxEnvironment : public ::testing::Environment
-{
-public:
-    void SetUp() override { m_init = std::make_unique<wxInitializer>(); }
-    void TearDown() override { m_init.reset(); }
-
-private:
-    std::unique_ptr<wxInitializer> m_init;
-};
+using wyxtest::WxEnvironment;
 
 inline wxArrayString Strings(std::initializer_list<const char*> texts)
 {
@@ -38,60 +30,11 @@ inline wxArrayString Strings(std::initializer_list<const char*> texts)
     return array;
 }
 
-// A fresh system root per test, so journals, hot folders and locks of one test
-// never meet another's (tests of several binaries may run at once).
-class SystemRoot
+class SystemRoot : public wyxtest::SystemRoot
 {
 public:
-    SystemRoot()
-    {
-        wxString base = wxFileName::CreateTempFileName("wyx-log");
-        wxRemoveFile(base);
-        m_root = base;
-        wxFileName::Mkdir(m_root, wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
-        wxSetEnv("WYX_SYSTEM_ROOT", m_root);
-        wxFileName::Mkdir(GetDataDirectory(), wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
-    }
-    ~SystemRoot()
-    {
-        wxFileName::Rmdir(m_root, wxPATH_RMDIR_RECURSIVE);
-        wxUnsetEnv("WYX_SYSTEM_ROOT");
-    }
-
-    const wxString& Path() const { return m_root; }
+    SystemRoot() : wyxtest::SystemRoot("wyx-log") {}
     wxString JournalPath() const { return GetDataDirectory() + "TiveraJobsLogFile.txt"; }
-
-    // Creates the hot folders, lists them in the data source's file and returns their paths.
-    wxArrayString MakeHotFolders(const wxArrayString& names) const
-    {
-        wxArrayString paths;
-        wxString ini = "[HotFolders]\n";
-        for (const wxString& name : names)
-        {
-            const wxString path = m_root + "/srv/hotfolders/" + name;
-            wxFileName::Mkdir(path + "/[_KELVO_HotFolder_]", wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
-            paths.Add(path);
-            ini += path + "\n";
-        }
-        WriteFile(GetDataDirectory() + "HotFolders.ini", ini);
-        return paths;
-    }
-
-    static void WriteFile(const wxString& path, const wxString& text)
-    {
-        wxFFile file(path, "wb");
-        ASSERT_TRUE(file.IsOpened()) << path;
-        file.Write(text, wxConvUTF8);
-    }
-    static void AppendFile(const wxString& path, const wxString& text)
-    {
-        wxFFile file(path, "ab");
-        ASSERT_TRUE(file.IsOpened()) << path;
-        file.Write(text, wxConvUTF8);
-    }
-
-private:
-    wxString m_root;
 };
 
 // 15 March 2021, 14:05:30 as an MS-DOS date-time.

@@ -13,6 +13,7 @@
 #include <wx/string.h>
 #include <wx/utils.h>
 
+#include "SystemRoot.h"
 #include "data/DataLocations.h"
 #include "pump/CustomEvents.h"
 #include "pump/EventBus.h"
@@ -20,50 +21,19 @@
 namespace statustest
 {
 
-// Event queues need an application object; the unit tests have no window.
-class WxEnvironment : public ::testing::Environment
+using wyxtest::WxEnvironment;
+
+class SystemRoot : public wyxtest::SystemRoot
 {
 public:
-    void SetUp() override { m_init = std::make_unique<wxInitializer>(); }
-    void TearDown() override { m_init.reset(); }
-
-private:
-    std::unique_ptr<wxInitializer> m_init;
-};
-
-// A fresh system root per test: journals and locks of one test never meet
-// another's, also when several test processes run at once.
-class SystemRoot
-{
-public:
-    SystemRoot()
-    {
-        const wxString base = wxFileName::CreateTempFileName("wyx-status");
-        wxRemoveFile(base);
-        m_root = base;
-        wxFileName::Mkdir(m_root, wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
-        wxSetEnv("WYX_SYSTEM_ROOT", m_root);
-        wxFileName::Mkdir(GetDataDirectory(), wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
-    }
-    ~SystemRoot()
-    {
-        wxFileName::Rmdir(m_root, wxPATH_RMDIR_RECURSIVE);
-        wxUnsetEnv("WYX_SYSTEM_ROOT");
-    }
-
-    const wxString& Path() const { return m_root; }
+    SystemRoot() : wyxtest::SystemRoot("wyx-status") {}
     wxString JournalPath() const { return GetDataDirectory() + "TiveraJobsStatusFile.txt"; }
-    wxString LockPath() const { return m_root + "/dev/shm/TiveraJobsStatusFile.lock"; }
-
-private:
-    wxString m_root;
+    wxString LockPath() const { return Path() + "/dev/shm/TiveraJobsStatusFile.lock"; }
 };
 
 inline void WriteFile(const wxString& path, const wxString& text)
 {
-    wxFFile file(path, "wb");
-    ASSERT_TRUE(file.IsOpened()) << path;
-    ASSERT_TRUE(file.Write(text, wxConvUTF8));
+    wyxtest::SystemRoot::WriteFile(path, text);
 }
 
 // A status journal line of nine fields; its DosTime is 15 March 2021, 14:05:30.

@@ -1,0 +1,86 @@
+#pragma once
+
+#include <memory>
+
+#include <gtest/gtest.h>
+
+#include <wx/arrstr.h>
+#include <wx/ffile.h>
+#include <wx/filefn.h>
+#include <wx/filename.h>
+#include <wx/init.h>
+#include <wx/string.h>
+#include <wx/utils.h>
+
+#include "data/DataLocations.h"
+
+namespace wyxtest
+{
+
+// Event queues need an application object; the unit tests have no window.
+class WxEnvironment : public ::testing::Environment
+{
+public:
+    void SetUp() override { m_init = std::make_unique<wxInitializer>(); }
+    void TearDown() override { m_init.reset(); }
+
+private:
+    std::unique_ptr<wxInitializer> m_init;
+};
+
+// A fresh system root per test, with its data directory: journals, hot folders
+// and locks of one test never meet another's, also when several test
+// processes run at once.
+class SystemRoot
+{
+public:
+    explicit SystemRoot(const char* prefix = "wyx-test")
+    {
+        const wxString base = wxFileName::CreateTempFileName(prefix);
+        wxRemoveFile(base);
+        m_root = base;
+        wxFileName::Mkdir(m_root, wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
+        wxSetEnv("WYX_SYSTEM_ROOT", m_root);
+        wxFileName::Mkdir(GetDataDirectory(), wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
+    }
+    ~SystemRoot()
+    {
+        wxFileName::Rmdir(m_root, wxPATH_RMDIR_RECURSIVE);
+        wxUnsetEnv("WYX_SYSTEM_ROOT");
+    }
+    SystemRoot(const SystemRoot&) = delete;
+    SystemRoot& operator=(const SystemRoot&) = delete;
+
+    const wxString& Path() const { return m_root; }
+
+    // Creates the hot folders, lists them in the data source's file and returns their paths.
+    wxArrayString MakeHotFolders(const wxArrayString& names) const
+    {
+        wxArrayString paths;
+        wxString ini = "[HotFolders]\n";
+        for (const wxString& name : names)
+        {
+            const wxString path = m_root + "/srv/hotfolders/" + name;
+            wxFileName::Mkdir(path + "/[_KELVO_HotFolder_]", wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
+            paths.Add(path);
+            ini += path + "\n";
+        }
+        WriteFile(GetDataDirectory() + "HotFolders.ini", ini);
+        return paths;
+    }
+
+    static void WriteFile(const wxString& path, const wxString& text) { Put(path, text, "wb"); }
+    static void AppendFile(const wxString& path, const wxString& text) { Put(path, text, "ab"); }
+
+private:
+    static void Put(const wxString& path, const wxString& text, const char* mode)
+    {
+        wxFFile file(path, mode);
+        ASSERT_TRUE(file.IsOpened()) << path;
+        ASSERT_TRUE(file.Write(text, wxConvUTF8)) << path;
+    }
+
+    wxString m_root;
+};
+
+} // namespace wyxtest
