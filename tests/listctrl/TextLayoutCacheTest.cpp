@@ -2,14 +2,11 @@
 #include "platform/ui/TextLayoutCache.h"
 #include "platform/ui/DrawTextTruncate.h"
 
+#include "PixelCompare.h"
+
 #include <gtest/gtest.h>
-#include <wx/bitmap.h>
-#include <wx/dcmemory.h>
-#include <wx/image.h>
 
 #include <functional>
-#include <sstream>
-#include <string>
 
 namespace
 {
@@ -18,40 +15,10 @@ const wxSize kCanvas(320, 40);
 
 wxImage Paint(const std::function<void(wxDC&)>& paint)
 {
-    wxBitmap bitmap(kCanvas, 24);
-    {
-        wxMemoryDC dc(bitmap);
-        dc.SetBackground(*wxWHITE_BRUSH);
-        dc.Clear();
-        paint(dc);
-    }
-    return bitmap.ConvertToImage();
+    return pixels::Render(kCanvas, *wxWHITE, paint);
 }
 
-// Empty when equal, else the first pixel that differs.
-std::string FirstDifference(const wxImage& actual, const wxImage& expected)
-{
-    for (int y = 0; y < actual.GetHeight(); ++y)
-        for (int x = 0; x < actual.GetWidth(); ++x)
-            if (actual.GetRed(x, y) != expected.GetRed(x, y) ||
-                actual.GetGreen(x, y) != expected.GetGreen(x, y) ||
-                actual.GetBlue(x, y) != expected.GetBlue(x, y))
-            {
-                std::ostringstream out;
-                out << "first difference at " << x << "," << y;
-                return out.str();
-            }
-    return std::string();
-}
-
-bool IsBlank(const wxImage& image)
-{
-    for (int y = 0; y < image.GetHeight(); ++y)
-        for (int x = 0; x < image.GetWidth(); ++x)
-            if (image.GetRed(x, y) != 255 || image.GetGreen(x, y) != 255 || image.GetBlue(x, y) != 255)
-                return false;
-    return true;
-}
+using pixels::FirstDifference;
 
 struct Style
 {
@@ -87,7 +54,7 @@ TEST(TextLayoutCache, DrawsWhatDrawTextDrawsFromTheFirstAndTheKeptLayout)
                     Apply(dc, style);
                     dc.DrawText(text, 7, 9);
                 });
-            ASSERT_FALSE(IsBlank(expected)) << text;
+            ASSERT_TRUE(pixels::AnyPixelDiffersIn(expected, 0, kCanvas.GetWidth(), *wxWHITE)) << text;
             for (int round = 0; round < 2; ++round)
             {
                 const wxImage actual = Paint(
