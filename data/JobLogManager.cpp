@@ -17,6 +17,7 @@
 #include "data/JobReadWriter.h"
 #include "data/NamedMutex.h"
 #include "platform/datasource/WyxDataSource.h"
+#include "platform/os/FileContents.h"
 #include "pump/CustomEvents.h"
 #include "pump/EventBus.h"
 
@@ -30,8 +31,7 @@ namespace
 constexpr std::size_t kLogLinePieces = 8;
 constexpr int kLogChannel = 1;
 
-// ClearLog runs on the GUI thread: a producer that keeps the journal locked
-// longer than this is not waited for.
+// A producer that keeps the journal locked longer than this makes a clear fail.
 constexpr std::chrono::milliseconds kClearLockLimit{3000};
 
 const std::locale& KeyFoldingLocale()
@@ -477,31 +477,35 @@ wxArrayString JobLogManager::GetErrorFolders() const
 
 int JobLogManager::ClearLog()
 {
-    bool replaced = false;
-    {
-        // Held across delete and create, so that a producer's append lands
-        // either before (and is cleared) or after (in the new file), and never
-        // writes the old lines back.
-        const BoundedJournalLock journalLock(m_lockName, kClearLockLimit);
-        {
-            std::lock_guard<std::mutex> guard(m_lock);
-            m_firstSequence += m_records.size();
-            m_records.clear();
-            m_records.shrink_to_fit();
-            m_keys.clear();
-            ++m_clearGeneration;
-        }
-        if (journalLock.IsLocked())
-            replaced = ReplaceJournalWithEmptyFile();
-    }
+    if (ClearJournalAndRecords() != 0)
+        return 1;
     ResetAllFolderErrors();
-    return replaced ? 0 : 1;
+    return 0;
 }
 
+int JobLogManager::ClearJournalAndRecords()
+{
+    // Held across the replacement and the emptying of the list, so that a
+    // producer's append lands either before (and is cleared) or after (in the
+    // new file), and a poll never takes the old lines in again.
+    const BoundedJournalLock journalLock(m_lockName, kClearLockLimit);
+    if (!journalLock.IsLocked() || !ReplaceJournalWithEmptyFile())
+        return 1;
+    std::lock_guard<std::mutex> guard(m_lock);
+    m_firstSequence += m_records.size();
+    m_records.clear();
+    m_records.shrink_to_fit();
+    m_keys.clear();
+    ++m_clearGeneration;
+    return 0;
+}
+
+// Written like every other change of a journal: the producer's group, mode and
+// owner stay, and a failure leaves the old journal whole.
 bool JobLogManager::ReplaceJournalWithEmptyFile()
 {
-    if (wxFileName::Exists(m_journalPath, wxFILE_EXISTS_ANY) && !wxRemoveFile(m_journalPath))
-        return false;
+    if (wyxos::StatFile(m_journalPath).exists)
+        return wyxos::ReplaceFileContents(m_journalPath, std::string());
     wxFile created;
     return created.Create(m_journalPath, false);
 }

@@ -72,10 +72,15 @@ public:
     // Hot folders with failed jobs, in the order first seen.
     wxArrayString GetErrorFolders() const;
 
-    // Empties the list, replaces the journal by an empty file under the journal's
-    // lock and resets every folder's error signal. 1 when the journal could not
-    // be replaced (its lock stayed held, or the file system refused).
+    // Replaces the journal by an empty file under the journal's lock, then
+    // empties the list and resets every folder's error signal. 1 when the
+    // journal could not be replaced (its lock stayed held, or the file system
+    // refused): then nothing at all has changed.
     int ClearLog();
+    // The first half of ClearLog, without the error signals: waits for the
+    // journal's lock (up to seconds), so it may run away from the GUI thread,
+    // which then calls ResetAllFolderErrors when it returned 0.
+    int ClearJournalAndRecords();
     void ResetAllFolderErrors();
     // See AcknowledgeResult.
     int AcknowledgeFolderErrors(const wxString& hotFolderPath);

@@ -3,6 +3,8 @@
 #include <set>
 #include <thread>
 
+#include <sys/stat.h>
+
 #include <gtest/gtest.h>
 
 #include "LogTestSupport.h"
@@ -438,8 +440,27 @@ TEST_F(LogModel, ClearLogLeavesTheJournalAloneWhileTheProducerHoldsItsLock)
     ASSERT_TRUE(producer.try_lock());
 
     EXPECT_EQ(1, m_model.ClearLog());
-    EXPECT_EQ(0u, m_model.GetRecordCount());
     EXPECT_GT(wxFileName::GetSize(m_root.JournalPath()), 0);
+    // A clear that did not happen changes nothing: the records and their keys
+    // stay, so the next change of the journal brings no line back twice.
+    EXPECT_EQ(1u, m_model.GetRecordCount());
+    producer.unlock();
+    Append(LogLine("1", "ADDED") + LogLine("2", "ADDED"));
+    ASSERT_EQ(1, m_model.Parse());
+    EXPECT_EQ((std::vector<wxString>{"1", "2"}), Keys(AllRecords(m_model)));
+}
+
+TEST_F(LogModel, ClearLogKeepsTheJournalsMode)
+{
+    Write(LogLine("1", "ADDED"));
+    ASSERT_TRUE(wxFileName(m_root.JournalPath())
+                    .SetPermissions(wxPOSIX_USER_READ | wxPOSIX_USER_WRITE | wxPOSIX_GROUP_READ |
+                                    wxPOSIX_GROUP_WRITE));
+    ASSERT_EQ(0, m_model.ClearLog());
+    EXPECT_EQ(0, wxFileName::GetSize(m_root.JournalPath()));
+    struct stat journal;
+    ASSERT_EQ(0, ::stat(m_root.JournalPath().utf8_str(), &journal));
+    EXPECT_EQ(0660u, journal.st_mode & 07777);
 }
 
 // Clears the log from inside a read, as the GUI thread may while the poller reads.
