@@ -90,20 +90,27 @@ int JobStatusManager::Parse()
         return 0;
 
     std::vector<JobRecord> jobs;
+    std::vector<std::uint64_t> startTimes;
     jobs.reserve(lines.size());
+    startTimes.reserve(lines.size());
     for (const wxString& line : lines)
     {
         if (!m_running)
             break;
         // Parsed where it is kept: a JobRecord moved is a JobRecord copied.
         jobs.emplace_back();
-        if (!ParseStatusLine(line, jobs.back()))
+        std::uint64_t started = 0;
+        if (ParseStatusLine(line, jobs.back(), &started))
+            startTimes.push_back(started);
+        else
             jobs.pop_back();
     }
 
     {
         std::lock_guard<std::mutex> guard(m_lock);
         m_jobs.swap(jobs);
+        m_startTimes.swap(startTimes);
+        ++m_generation;
     }
     return 1;
 }
@@ -117,10 +124,12 @@ int JobStatusManager::Refresh()
     return 1;
 }
 
-int JobStatusManager::GetJobs(std::vector<JobRecord>& jobs) const
+int JobStatusManager::GetJobs(std::vector<JobRecord>& jobs, std::vector<std::uint64_t>* startTimes) const
 {
     std::lock_guard<std::mutex> guard(m_lock);
     jobs.insert(jobs.end(), m_jobs.begin(), m_jobs.end());
+    if (startTimes)
+        startTimes->insert(startTimes->end(), m_startTimes.begin(), m_startTimes.end());
     return 0;
 }
 

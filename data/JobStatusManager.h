@@ -1,6 +1,7 @@
 #pragma once
 
 #include <atomic>
+#include <cstdint>
 #include <memory>
 #include <mutex>
 #include <vector>
@@ -37,8 +38,12 @@ public:
     // 1 when the list was replaced (also by an equal one), else 0.
     int Parse();
 
-    // Appends a copy of every job in journal order; returns 0.
-    int GetJobs(std::vector<JobRecord>& jobs) const;
+    // Appends a copy of every job in journal order; returns 0. startTimes, when
+    // given, receives each job's start as a DOS date-time number, in the same order.
+    int GetJobs(std::vector<JobRecord>& jobs, std::vector<std::uint64_t>* startTimes = nullptr) const;
+    // Counts the replacements of the list: a view that has shown generation g
+    // has nothing to do while the count is still g.
+    std::uint64_t GetGeneration() const { return m_generation; }
     // The configured print servers, from the data source.
     long GetServers(wxArrayString& names) const;
 
@@ -70,4 +75,6 @@ private:
 
     mutable std::mutex m_lock;
     std::vector<JobRecord> m_jobs;
+    std::vector<std::uint64_t> m_startTimes;
+    std::atomic<std::uint64_t> m_generation{0};
 };

@@ -48,7 +48,20 @@ size_t SplitPieces(const wchar_t* line, size_t length,
 
 } // namespace
 
-bool ParseStatusLine(const wxString& line, JobRecord& record)
+std::uint64_t LeadingDecimal(const wchar_t* text, size_t length)
+{
+    std::uint64_t value = 0;
+    for (size_t i = 0; i < length && text[i] >= L'0' && text[i] <= L'9'; ++i)
+    {
+        const unsigned digit = static_cast<unsigned>(text[i] - L'0');
+        if (value > (UINT64_MAX - digit) / 10)
+            return UINT64_MAX;
+        value = value * 10 + digit;
+    }
+    return value;
+}
+
+bool ParseStatusLine(const wxString& line, JobRecord& record, std::uint64_t* startTime)
 {
     // Split in place over the characters: copies are made only of the pieces kept.
     const wchar_t* const text = line.wc_str();
@@ -85,5 +98,7 @@ bool ParseStatusLine(const wxString& line, JobRecord& record)
     wxString time = FormatDosTime(text + pieces[DosTime].first, pieces[DosTime].second);
     record[StatusField::TimeText].swap(time);
     take(StatusField::Status, Status);
+    if (startTime)
+        *startTime = LeadingDecimal(text + pieces[DosTime].first, pieces[DosTime].second);
     return true;
 }
