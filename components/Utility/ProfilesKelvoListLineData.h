@@ -51,6 +51,12 @@ class ProfilesKelvoListLineData
 {
 public:
     explicit ProfilesKelvoListLineData(size_t columns = 0) : m_cells(columns) {}
+    // Declared noexcept so that a growing list moves its rows instead of
+    // copying every cell text (wxColour and wxFont only share their data).
+    ProfilesKelvoListLineData(ProfilesKelvoListLineData&&) noexcept = default;
+    ProfilesKelvoListLineData& operator=(ProfilesKelvoListLineData&&) noexcept = default;
+    ProfilesKelvoListLineData(const ProfilesKelvoListLineData&) = default;
+    ProfilesKelvoListLineData& operator=(const ProfilesKelvoListLineData&) = default;
 
     size_t GetCellCount() const { return m_cells.size(); }
     void SetCellCount(size_t columns) { m_cells.resize(columns); }

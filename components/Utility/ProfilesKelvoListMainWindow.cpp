@@ -5,6 +5,8 @@
 
 #include <algorithm>
 #include <climits>
+#include <iterator>
+#include <type_traits>
 
 namespace
 {
@@ -162,6 +164,47 @@ long ProfilesKelvoListMainWindow::InsertLine(long index, ProfilesKelvoListLineDa
             ++m_anchor;
     }
     MarkDirty();
+    return at;
+}
+
+// A growing list of a hundred thousand rows must move them, not copy every text.
+static_assert(std::is_nothrow_move_constructible<ProfilesKelvoListLineData>::value, "rows must move cheaply");
+
+long ProfilesKelvoListMainWindow::InsertLines(long index, std::vector<ProfilesKelvoListLineData> lines)
+{
+    if (IsVirtual())
+        return -1;
+    const long count = GetItemCount();
+    const long at = (index < 0 || index > count) ? count : index;
+    const long added = static_cast<long>(lines.size());
+    if (added == 0)
+        return at;
+    if (count == 0)
+    {
+        // Taken whole, with the room the caller reserved for later appends.
+        m_lines.swap(lines);
+        MarkDirty();
+        return at;
+    }
+    m_lines.insert(m_lines.begin() + at, std::make_move_iterator(lines.begin()),
+                   std::make_move_iterator(lines.end()));
+    if (at < count)
+    {
+        for (long i = 0; i < added; ++i)
+            m_selection.InsertGap(at);
+        if (m_current >= at)
+            m_current += added;
+        if (m_anchor >= at)
+            m_anchor += added;
+        MarkDirty();
+        return at;
+    }
+    if (m_dirty)
+        return at;
+    // Appended: the rows above keep their place, so only the new ones and the
+    // scrollbar's range need drawing.
+    UpdateScrollbars();
+    RefreshLines(at, at + added - 1);
     return at;
 }
 

@@ -39,6 +39,9 @@ public:
     long GetItemCount() const;
     void SetItemCount(long count);
     long InsertLine(long index, ProfilesKelvoListLineData line);
+    // Many rows with one layout. Rows added at the end of a laid-out list
+    // repaint only where they show, and the scrollbar; nothing else moves.
+    long InsertLines(long index, std::vector<ProfilesKelvoListLineData> lines);
     bool DeleteLine(long index);
     void DeleteAllLines();
     // Stored rows of a non-virtual list; null out of range or in virtual mode.

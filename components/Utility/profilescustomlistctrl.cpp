@@ -186,6 +186,11 @@ long ProfilesKelvoProfilesListCtrl::InsertItem(const wxListItem& info)
     return at;
 }
 
+long ProfilesKelvoProfilesListCtrl::InsertItems(long index, std::vector<ProfilesKelvoListLineData> lines)
+{
+    return m_main->InsertLines(index, std::move(lines));
+}
+
 bool ProfilesKelvoProfilesListCtrl::SetItem(long index, int col, const wxString& label, int imageId)
 {
     wxListItem info;

@@ -14,6 +14,7 @@
 #include <wx/listctrl.h>
 
 #include <memory>
+#include <vector>
 
 // Creation record of the list: the header's look. The background colour is
 // carried for the callers; the list uses the bitmap, font and text colour.
@@ -61,6 +62,10 @@ public:
     // Items
     long InsertItem(long index, const wxString& label, int imageIndex = kCellImageNone);
     long InsertItem(const wxListItem& info);
+    // Prepared rows, inserted at `index` (past the end: appended) with one
+    // layout; returns the index of the first. What InsertItem and SetItem do
+    // row by row, for lists of many thousand rows.
+    long InsertItems(long index, std::vector<ProfilesKelvoListLineData> lines);
     bool SetItem(long index, int col, const wxString& label, int imageId = kCellImageNone);
     bool SetItem(wxListItem& info);
     bool SetItemData(long item, long data);
