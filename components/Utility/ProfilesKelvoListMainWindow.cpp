@@ -548,11 +548,16 @@ void ProfilesKelvoListMainWindow::LayoutIfNeeded()
 {
     if (!m_dirty)
         return;
+    LayOut();
+    Refresh();
+}
+
+void ProfilesKelvoListMainWindow::LayOut()
+{
     m_dirty = false;
     UpdateLineHeight();
     ClampScrollPosition();
     UpdateScrollbars();
-    Refresh();
     if (ProfilesKelvoListHeaderWindow* header = m_owner->GetHeaderWindow())
         header->Refresh();
 }

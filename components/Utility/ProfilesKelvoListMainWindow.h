@@ -79,7 +79,8 @@ public:
     void ScrollToTop(long item);
     void ScrollToX(int x);
 
-    // Layout is recomputed when idle, never while painting.
+    // Layout is recomputed once for a batch of changes: when idle, or at the
+    // next paint if that comes first.
     void MarkDirty();
     bool IsDirty() const { return m_dirty; }
     void LayoutIfNeeded();
@@ -114,6 +115,7 @@ public:
 private:
     // Layout
     int AutoColumnWidth(long col, bool useHeader) const;
+    void LayOut();
     void UpdateLineHeight();
     void UpdateScrollbars();
     void ClampScrollPosition();

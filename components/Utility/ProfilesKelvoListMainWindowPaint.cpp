@@ -79,6 +79,12 @@ void DrawListStatusMark(wxDC& dc, int image, int x, int rowTop, const wxColour& 
 
 void ProfilesKelvoListMainWindow::OnPaint(wxPaintEvent&)
 {
+    // GTK paints before wx's idle time: a change made in an event handler
+    // reaches the screen before the idle layout would run. Laying out here
+    // keeps that frame from showing an empty list; the change already
+    // invalidated the whole window, so this paint draws all of it.
+    if (m_dirty)
+        LayOut();
     wxAutoBufferedPaintDC dc(this);
     HintVisibleRange();
     Render(dc, GetUpdateRegion().GetBox());
