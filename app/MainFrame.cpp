@@ -2,6 +2,8 @@
 
 #include "app/MainView.h"
 #include "platform/themer/Themer.h"
+#include "views/JobStatusView.h"
+#include "views/ViewMetrics.h"
 
 #include <wx/intl.h>
 #include <wx/panel.h>
@@ -23,7 +25,7 @@ wxWindow* CreatePlaceholderPage(wxWindow* parent)
 wxBEGIN_EVENT_TABLE(CMainFrame, wxFrame) wxEND_EVENT_TABLE()
 
     CMainFrame::CMainFrame(const wxString& title, const wxPoint& pos, const wxSize& size)
-    : wxFrame(nullptr, wxID_ANY, title, pos, size, wxDEFAULT_FRAME_STYLE)
+    : wxFrame(nullptr, wxID_ANY, title, pos, viewmetrics::ScaledFrameSize(size), wxDEFAULT_FRAME_STYLE)
 {
     BuildLayout();
 }
@@ -36,7 +38,7 @@ void CMainFrame::BuildLayout()
     m_notebook = new MainView;
     m_notebook->Create(this, kNotebookId, wxDefaultPosition, clientSize, wxNB_TOP | wxBORDER_NONE,
                        "CNOwnerDrawNotebook");
-    m_statusView = CreatePlaceholderPage(m_notebook);
+    m_statusView = new JobStatusView(m_notebook, wxID_ANY);
     m_notebook->AddPage(m_statusView, _("Status"), false, 1, nullptr, -1, false);
     m_logView = CreatePlaceholderPage(m_notebook);
     m_notebook->AddPage(m_logView, _("Log"), false, 2, nullptr, -1, false);

@@ -27,6 +27,12 @@ void CustomListCtrl::SetRecords(const std::vector<JobRecord>& rows)
     records = rows;
 }
 
+void CustomListCtrl::SetRecords(std::vector<JobRecord>&& rows)
+{
+    records.swap(rows);
+    rows.clear();
+}
+
 void CustomListCtrl::SetStatusImage(std::int32_t image)
 {
     statusImage = image;
@@ -45,7 +51,13 @@ int CustomListCtrl::OnGetItemImage(long item, long column) const
 {
     if (column != kStatusColumn || item < 0 || static_cast<std::size_t>(item) >= records.size())
         return kCellImageNone;
-    return IsInProgress(records[item][StatusField::Status]) ? statusImage : kCellImageNone;
+    return IsRowInProgress(item) ? statusImage : kCellImageNone;
+}
+
+bool CustomListCtrl::IsRowInProgress(long item) const
+{
+    return item >= 0 && static_cast<std::size_t>(item) < records.size() &&
+           IsInProgress(records[item][StatusField::Status]);
 }
 
 bool CustomListCtrl::IsInProgress(const wxString& status) const

@@ -24,11 +24,16 @@ public:
 
     // Replaces the rows; the caller refreshes and sets the item count after.
     void SetRecords(const std::vector<JobRecord>& rows);
+    // The same without a copy: the rows are taken over and `rows` is left empty.
+    void SetRecords(std::vector<JobRecord>&& rows);
     // The small-image index shown for rows in progress; no repaint.
     void SetStatusImage(std::int32_t image);
 
     wxString OnGetItemText(long item, long column) const override;
     int OnGetItemImage(long item, long column) const override;
+
+    // Whether the row shows the busy wheel: its status is one of the in-progress texts.
+    bool IsRowInProgress(long item) const;
 
     const std::vector<JobRecord>& GetRecords() const { return records; }
     std::int32_t GetStatusImage() const { return statusImage; }

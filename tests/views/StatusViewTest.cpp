@@ -1,0 +1,261 @@
+// The Status tab on a real display, over the real status model on a
+// temporary system root: what the user sees after journal changes, filter
+// choices, column clicks and ticks of the busy wheel.
+#include "views/JobStatusView.h"
+
+#include "components/Utility/CustomComboBox.h"
+#include "components/Utility/CustomListCtrl.h"
+#include "pump/CustomEvents.h"
+
+#include "../listctrl/ListTestSupport.h"
+#include "../status/StatusTestSupport.h"
+#include "GuiTest.h"
+#include "DrawNow.h"
+#include "ScreenGrab.h"
+
+#include <wx/frame.h>
+#include <wx/statusbr.h>
+
+#include <cstring>
+
+namespace
+{
+
+// One journal line: the key names the file, DosTime orders the jobs by start.
+wxString Line(const wxString& key, const wxString& server, const wxString& status = "Queued",
+              const wxString& dosTime = "1383035055", const wxString& size = "48213")
+{
+    return key + "\t/srv/in/Proofs\t/srv/in/Proofs/" + key + ".pdf\t" + server + "\t" + dosTime + "\t" + status +
+           "\t" + size + "\tPDF\tADDED\n";
+}
+
+bool SameImage(const wxImage& a, const wxImage& b)
+{
+    return a.GetSize() == b.GetSize() &&
+           memcmp(a.GetData(), b.GetData(), static_cast<size_t>(a.GetWidth() * a.GetHeight() * 3)) == 0;
+}
+
+class StatusView : public ::testing::Test
+{
+protected:
+    void SetUp() override
+    {
+        statustest::SystemRoot::WriteFile(GetDataDirectory() + "HotFolders.ini",
+                                          "[Servers]\nsrv1\nsrv2\nSRV3\n");
+        frame = new wxFrame(nullptr, wxID_ANY, "status", wxPoint(0, 0), wxSize(1100, 500));
+        view = new JobStatusView(frame, wxID_ANY, model);
+        frame->Show();
+        guitest::Pump();
+    }
+    void TearDown() override
+    {
+        frame->Destroy();
+        guitest::Pump();
+    }
+
+    // Rewrites the journal and lets the poll and the view do their part.
+    void Produce(const wxString& lines)
+    {
+        statustest::SystemRoot::WriteFile(root.JournalPath(), lines);
+        ASSERT_EQ(model.Refresh(), 1);
+        guitest::Pump();
+    }
+
+    std::vector<wxString> Column(long column) const
+    {
+        std::vector<wxString> texts;
+        for (long row = 0; row < List()->GetItemCount(); ++row)
+            texts.push_back(List()->OnGetItemText(row, column));
+        return texts;
+    }
+    int Mark(int column) const
+    {
+        wxListItem info;
+        List()->GetColumn(column, info);
+        return info.GetImage();
+    }
+    long Selected() const { return List()->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED); }
+
+    void ClickColumn(int column)
+    {
+        wxListEvent event(wxEVT_LIST_COL_CLICK, List()->GetId());
+        event.SetEventObject(List());
+        event.m_col = column;
+        List()->GetEventHandler()->ProcessEvent(event);
+    }
+    void ChooseServer(const wxString& entry)
+    {
+        wxCommandEvent press(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK);
+        view->ProcessWindowEvent(press);
+        const int index = view->GetServerBox()->FindString(entry, true);
+        ASSERT_NE(index, wxNOT_FOUND) << entry;
+        view->GetServerBox()->SetSelection(index);
+        wxCommandEvent chosen(wxEVT_COMBOBOX, JobStatusView::kServerBoxId);
+        chosen.SetInt(index);
+        view->GetServerBox()->GetEventHandler()->ProcessEvent(chosen);
+    }
+    void Tick()
+    {
+        wxTimer timer;
+        wxTimerEvent tick(timer);
+        view->ProcessWindowEvent(tick);
+    }
+    // What the rows window shows on the display once the toolkit has painted.
+    wxImage Screen() const
+    {
+        guitest::Pump();
+        ProfilesKelvoListMainWindow* rows = List()->GetMainWindow();
+        return GrabScreen(wxRect(rows->GetScreenPosition(), rows->GetClientSize()));
+    }
+
+    CustomListCtrl* List() const { return view->GetJobList(); }
+    wxString Footer() const { return view->GetFooter()->GetStatusText(0); }
+
+    statustest::SystemRoot root;
+    JobStatusManager model{root.JournalPath()};
+    wxFrame* frame = nullptr;
+    JobStatusView* view = nullptr;
+};
+
+TEST_F(StatusView, JournalChangesReachTheRowsAndTheFooterInFileNameOrder)
+{
+    EXPECT_EQ(Footer(), "0 Items ");
+    EXPECT_EQ(Mark(1), 0) << "File Name is sorted ascending before any click";
+    Produce(Line("b", "srv1") + Line("C", "srv1", "Saving...") + Line("a", "srv2"));
+    EXPECT_EQ(Column(1), (std::vector<wxString>{"a", "b", "C"}));
+    EXPECT_EQ(Column(0), (std::vector<wxString>{"1", "2", "3"}));
+    EXPECT_EQ(Footer(), "3 Items ");
+
+    Produce(Line("b", "srv1"));
+    EXPECT_EQ(Column(1), (std::vector<wxString>{"b"}));
+    EXPECT_EQ(Footer(), "1 Items ");
+}
+
+TEST_F(StatusView, ServerFilterHidesOtherServersAndAllServersRestoresThem)
+{
+    Produce(Line("a", "srv1") + Line("b", "SRV1 ") + Line("c", "srv2"));
+    ChooseServer("srv1");
+    EXPECT_EQ(Column(1), (std::vector<wxString>{"a", "b"}));
+    EXPECT_EQ(Footer(), "2 Items ");
+
+    Produce(Line("a", "srv1") + Line("d", "srv2"));
+    EXPECT_EQ(Column(1), (std::vector<wxString>{"a"})) << "the filter holds across updates";
+
+    ChooseServer("All Servers      ");
+    EXPECT_EQ(Column(1), (std::vector<wxString>{"a", "d"}));
+    EXPECT_EQ(Footer(), "2 Items ");
+}
+
+TEST_F(StatusView, ColumnClicksFlipTheOrderAndTheMarkAndTimeSortsByStart)
+{
+    Produce(Line("a", "srv2", "Queued", "1383035100") + Line("b", "srv3", "Queued", "1383035000") +
+            Line("c", "srv1", "Queued", "1383036000"));
+    ClickColumn(4);
+    EXPECT_EQ(Column(4), (std::vector<wxString>{"srv3", "srv2", "srv1"}));
+    EXPECT_EQ(Mark(4), 1);
+    EXPECT_EQ(Mark(1), -1);
+    ClickColumn(4);
+    EXPECT_EQ(Column(4), (std::vector<wxString>{"srv1", "srv2", "srv3"}));
+    EXPECT_EQ(Mark(4), 0);
+
+    for (int ignored : {0, -1})
+    {
+        ClickColumn(ignored);
+        EXPECT_EQ(Column(4), (std::vector<wxString>{"srv1", "srv2", "srv3"})) << ignored;
+        EXPECT_EQ(Mark(4), 0) << ignored;
+    }
+
+    ClickColumn(6);
+    EXPECT_EQ(Column(1), (std::vector<wxString>{"c", "a", "b"})) << "latest start first";
+    Produce(Line("a", "srv2", "Queued", "1383035100") + Line("d", "srv1", "Queued", "1383099000"));
+    EXPECT_EQ(Column(1), (std::vector<wxString>{"d", "a"})) << "an update keeps the sort";
+}
+
+TEST_F(StatusView, TheSelectedJobStaysSelectedUntilItLeaves)
+{
+    Produce(Line("b", "srv1") + Line("c", "srv1"));
+    List()->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
+    Produce(Line("a", "srv1") + Line("b", "srv1") + Line("c", "srv1") + Line("x", "srv2"));
+    EXPECT_EQ(Selected(), 1) << "b moved down a row and the selection with it";
+    ClickColumn(1);
+    EXPECT_EQ(Column(1)[Selected()], "b") << "after a re-sort";
+    ChooseServer("srv1");
+    EXPECT_EQ(Column(1)[Selected()], "b") << "after a filter change";
+    Produce(Line("a", "srv1") + Line("c", "srv1"));
+    EXPECT_EQ(Selected(), -1) << "a job that left the journal left the selection";
+}
+
+TEST_F(StatusView, ServerListFollowsTheDataSourceAndKeepsAllServers)
+{
+    wxCommandEvent press(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK);
+    view->ProcessWindowEvent(press);
+    EXPECT_EQ(view->GetServerBox()->GetStrings(),
+              wxSplit("All Servers      ,srv1,srv2,SRV3", ','));
+    statustest::SystemRoot::WriteFile(GetDataDirectory() + "HotFolders.ini", "[Servers]\nsrv2\n");
+    view->ProcessWindowEvent(press);
+    EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv2", ','));
+}
+
+TEST_F(StatusView, ATickTurnsTheWheelOfRowsInProgressOnly)
+{
+    Produce(Line("a", "srv1", "Saving...") + Line("b", "srv1", "Queued") + Line("c", "srv1", "saving...") +
+            Line("d", "srv1", "Transferring to server"));
+    Tick(); // the first tick shows the frame the rows started with
+    const wxImage before = Screen();
+    Tick();
+    const wxImage after = Screen();
+    ASSERT_TRUE(before.IsOk() && after.IsOk());
+
+    const int lineHeight = List()->GetMainWindow()->GetLineHeight();
+    wxRect status;
+    List()->GetSubItemRect(0, 7, status);
+    for (long row = 0; row < 4; ++row)
+    {
+        const wxRect wheel(status.x, row * lineHeight, 18, lineHeight);
+        const wxRect rest(0, row * lineHeight, status.x, lineHeight);
+        EXPECT_EQ(SameImage(before.GetSubImage(wheel), after.GetSubImage(wheel)), row == 1 || row == 2)
+            << "only rows 0 and 3 are in progress; row " << row;
+        EXPECT_TRUE(SameImage(before.GetSubImage(rest), after.GetSubImage(rest))) << "row " << row;
+    }
+}
+
+TEST_F(StatusView, RowsArePaintedInTheFrameRightAfterAnUpdateBeforeIdleTime)
+{
+    statustest::SystemRoot::WriteFile(root.JournalPath(), Line("a", "srv1") + Line("b", "srv1"));
+    ASSERT_EQ(model.Refresh(), 1);
+    // The update's event, then a paint: the order GTK keeps, idle time comes after.
+    wxTheApp->ProcessPendingEvents();
+    ASSERT_EQ(List()->GetItemCount(), 2);
+    const wxImage screen = DrawNow(List()->GetMainWindow());
+    ASSERT_TRUE(screen.IsOk());
+    const int lineHeight = List()->GetMainWindow()->GetLineHeight();
+    wxRect name;
+    List()->GetSubItemRect(1, 1, name);
+    int inked = 0;
+    for (int y = lineHeight; y < 2 * lineHeight; ++y)
+        for (int x = name.x; x < name.x + 40; ++x)
+            inked += screen.GetGreen(x, y) < 128 ? 1 : 0;
+    EXPECT_GT(inked, 5) << "the second row's file name is on the screen";
+}
+
+TEST_F(StatusView, TheLongestStatusAndASevenDigitSizeFitTheirColumns)
+{
+    Produce(Line("a", "srv1", "Transferring to server", "1383035055", "1048576") +
+            Line("b", "srv1", "Converting file type", "1383035055", "1048575"));
+    EXPECT_EQ(Column(5), (std::vector<wxString>{"1024.00KB", "1024.00KB"}));
+    for (int column : {5, 7})
+    {
+        wxRect cell;
+        List()->GetSubItemRect(0, column, cell);
+        cell.height *= 2;
+        cell.width -= 3; // the rule at the column's edge moves with it
+        const wxImage fitted = listtest::RenderRows(List()).GetSubImage(cell);
+        const int width = List()->GetColumnWidth(column);
+        List()->SetColumnWidth(column, 1000);
+        const wxImage roomy = listtest::RenderRows(List()).GetSubImage(cell);
+        List()->SetColumnWidth(column, width);
+        EXPECT_TRUE(SameImage(fitted, roomy)) << "column " << column << " shortens its text";
+    }
+}
+
+} // namespace

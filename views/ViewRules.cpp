@@ -1,0 +1,191 @@
+#include "views/ViewRules.h"
+
+#include "data/StatusLine.h"
+
+#include <wx/intl.h>
+
+#include <algorithm>
+#include <cmath>
+#include <cstdlib>
+#include <numeric>
+
+namespace viewrules
+{
+
+wxString TrimmedRight(const wxString& text)
+{
+    wxString trimmed(text);
+    trimmed.Trim(true);
+    return trimmed;
+}
+
+bool SameFilterText(const wxString& a, const wxString& b)
+{
+    return TrimmedRight(a).CmpNoCase(TrimmedRight(b)) == 0;
+}
+
+wxString LastPathComponent(const wxString& path)
+{
+    size_t end = path.length();
+    while (end > 1 && path[end - 1] == wxS('/'))
+        --end;
+    const size_t slash = path.rfind(wxS('/'), end - (end > 0 ? 1 : 0));
+    const size_t start = (slash == wxString::npos || end == 0) ? 0 : slash + 1;
+    return path.substr(start, end - start);
+}
+
+wxString FileTitle(const wxString& path)
+{
+    wxString name = LastPathComponent(path);
+    const size_t dot = name.rfind(wxS('.'));
+    if (dot != wxString::npos && dot > 0)
+        name.erase(dot);
+    return name;
+}
+
+wxString FormatSize(const wxString& bytes)
+{
+    if (bytes.CmpNoCase(wxS("N/A")) == 0 || bytes.empty())
+        return bytes;
+    const std::string narrow = bytes.ToStdString();
+    char* end = nullptr;
+    double value = std::strtod(narrow.c_str(), &end);
+    if (end == narrow.c_str() || !std::isfinite(value))
+        value = 0;
+    value /= 1024;
+    const char* unit = "KB";
+    if (value > 1024)
+    {
+        value /= 1024;
+        unit = "MB";
+        if (value > 1024)
+        {
+            value /= 1024;
+            unit = "GB";
+        }
+    }
+    return wxString::Format(wxS("%0.2f"), value) + wxGetTranslation(unit);
+}
+
+wxArrayString MergeFilterEntries(const wxArrayString& entries, const wxArrayString& names,
+                                 const wxString& fixedEntry)
+{
+    wxArrayString merged(entries);
+    for (const wxString& name : names)
+    {
+        const wxString trimmed = TrimmedRight(name);
+        const bool present = std::any_of(merged.begin(), merged.end(), [&](const wxString& entry)
+                                         { return TrimmedRight(entry).CmpNoCase(trimmed) == 0; });
+        if (!present)
+            merged.Add(trimmed);
+    }
+    wxArrayString trimmedNames;
+    for (const wxString& name : names)
+        trimmedNames.Add(TrimmedRight(name));
+    const wxString fixed = TrimmedRight(fixedEntry);
+    wxArrayString kept;
+    for (const wxString& entry : merged)
+    {
+        const wxString trimmed = TrimmedRight(entry);
+        if (trimmed == fixed || trimmedNames.Index(trimmed, true) != wxNOT_FOUND)
+            kept.Add(entry);
+    }
+    return kept;
+}
+
+wxString CountFooter(long count)
+{
+    return wxString::Format(wxS("%ld "), count) + wxGetTranslation("Items") + wxS(" ");
+}
+
+wxString SelectionFooter(const wxString& templateText, long selected, long count)
+{
+    wxString text(templateText);
+    text.Replace(wxS("[WYX3Value1]"), wxString::Format(wxS("%ld"), selected), false);
+    text.Replace(wxS("[WYX3Value2]"), wxString::Format(wxS("%ld"), count), false);
+    return text;
+}
+
+std::uint64_t SortNumber(const wxString& text)
+{
+    return LeadingDecimal(text.wc_str(), text.length());
+}
+
+std::wstring SortKeys::Fold(const wxString& text)
+{
+    std::wstring folded = text.ToStdWstring();
+    for (wchar_t& c : folded)
+        c = static_cast<wchar_t>(wxTolower(c));
+    return folded;
+}
+
+std::vector<std::size_t> SortKeys::Order(bool descending) const
+{
+    const std::size_t count = kind == SortKind::Text ? texts.size() : numbers.size();
+    std::vector<std::size_t> order(count);
+    std::iota(order.begin(), order.end(), std::size_t{0});
+    auto compare = [&](auto before)
+    { std::stable_sort(order.begin(), order.end(), before); };
+    if (kind == SortKind::Text)
+    {
+        if (descending)
+            compare([this](std::size_t a, std::size_t b) { return texts[a] > texts[b]; });
+        else
+            compare([this](std::size_t a, std::size_t b) { return texts[a] < texts[b]; });
+    }
+    else
+    {
+        if (descending)
+            compare([this](std::size_t a, std::size_t b) { return numbers[a] > numbers[b]; });
+        else
+            compare([this](std::size_t a, std::size_t b) { return numbers[a] < numbers[b]; });
+    }
+    return order;
+}
+
+void ApplyOrder(std::vector<JobRecord>& records, const std::vector<std::size_t>& order)
+{
+    // Follow each cycle of the permutation, swapping texts in place.
+    std::vector<bool> placed(order.size(), false);
+    for (std::size_t start = 0; start < order.size(); ++start)
+    {
+        if (placed[start])
+            continue;
+        std::size_t at = start;
+        while (order[at] != start)
+        {
+            for (std::size_t field = 0; field < records[at].size(); ++field)
+                records[at][field].swap(records[order[at]][field]);
+            placed[at] = true;
+            at = order[at];
+        }
+        placed[at] = true;
+    }
+}
+
+ColumnSortState::ColumnSortState(int sortableColumns, int initialColumn, bool initialDescending)
+    : nextDescending(static_cast<std::size_t>(std::max(0, sortableColumns)), true), column(initialColumn),
+      descending(initialDescending)
+{
+}
+
+bool ColumnSortState::Click(int clicked)
+{
+    if (clicked < 1 || clicked > static_cast<int>(nextDescending.size()))
+        return false;
+    column = clicked;
+    descending = nextDescending[clicked - 1];
+    nextDescending[clicked - 1] = !descending;
+    return true;
+}
+
+const wxString kCharWidthSample = wxS("abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ");
+
+int ScaleColumnWidth(int referenceWidth, double averageCharWidth)
+{
+    constexpr double kReferenceCharWidth = 6.5;
+    const double scale = std::max(1.0, averageCharWidth / kReferenceCharWidth);
+    return static_cast<int>(std::lround(referenceWidth * scale));
+}
+
+} // namespace viewrules
