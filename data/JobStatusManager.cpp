@@ -44,7 +44,8 @@ JobStatusManager::JobStatusManager(const wxString& journalPath, std::unique_ptr<
 JobStatusManager::~JobStatusManager()
 {
     std::lock_guard<std::mutex> guard(m_lock);
-    m_jobs.clear();
+    m_snapshot.reset();
+    m_previous.reset();
 }
 
 void JobStatusManager::SetRunning(bool running)
@@ -89,8 +90,9 @@ int JobStatusManager::Parse()
     if (ReadChangedJournal(lines) != ReadOutcome::Read)
         return 0;
 
-    std::vector<JobRecord> jobs;
-    std::vector<std::uint64_t> startTimes;
+    auto fresh = std::make_shared<JobSnapshot>();
+    std::vector<JobRecord>& jobs = fresh->jobs;
+    std::vector<std::uint64_t>& startTimes = fresh->startTimes;
     jobs.reserve(lines.size());
     startTimes.reserve(lines.size());
     for (const wxString& line : lines)
@@ -106,12 +108,16 @@ int JobStatusManager::Parse()
             jobs.pop_back();
     }
 
+    std::shared_ptr<const JobSnapshot> released;
     {
         std::lock_guard<std::mutex> guard(m_lock);
-        m_jobs.swap(jobs);
-        m_startTimes.swap(startTimes);
+        released = std::move(m_previous);
+        m_previous = std::move(m_snapshot);
+        m_snapshot = std::move(fresh);
         ++m_generation;
     }
+    // Freed here, outside the lock, unless a view still shows that read.
+    released.reset();
     return 1;
 }
 
@@ -126,11 +132,17 @@ int JobStatusManager::Refresh()
 
 int JobStatusManager::GetJobs(std::vector<JobRecord>& jobs, std::vector<std::uint64_t>* startTimes) const
 {
-    std::lock_guard<std::mutex> guard(m_lock);
-    jobs.insert(jobs.end(), m_jobs.begin(), m_jobs.end());
+    const std::shared_ptr<const JobSnapshot> snapshot = GetSnapshot();
+    jobs.insert(jobs.end(), snapshot->jobs.begin(), snapshot->jobs.end());
     if (startTimes)
-        startTimes->insert(startTimes->end(), m_startTimes.begin(), m_startTimes.end());
+        startTimes->insert(startTimes->end(), snapshot->startTimes.begin(), snapshot->startTimes.end());
     return 0;
+}
+
+std::shared_ptr<const JobSnapshot> JobStatusManager::GetSnapshot() const
+{
+    std::lock_guard<std::mutex> guard(m_lock);
+    return m_snapshot;
 }
 
 long JobStatusManager::GetServers(wxArrayString& names) const

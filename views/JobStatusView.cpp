@@ -154,10 +154,7 @@ void JobStatusView::RefreshFromModel()
     // Read before the copy: a swap in between only makes the next event copy again.
     shownGeneration = model.GetGeneration();
     shownOnce = true;
-    std::vector<JobRecord> jobs;
-    std::vector<std::uint64_t> startTimes;
-    model.GetJobs(jobs, &startTimes);
-    sortedJobs.Replace(jobs, startTimes);
+    sortedJobs.Replace(model.GetSnapshot());
     SortJobs();
     BuildRows();
 }
@@ -188,9 +185,9 @@ void JobStatusView::BuildRows()
 {
     wxCriticalSectionLocker guard(lock);
     const wxString selectedKey = SelectedKey();
-    std::vector<JobRecord> rows = sortedJobs.BuildRows(serverFilterActive, serverFilter);
-    const long count = static_cast<long>(rows.size());
-    jobList->SetRecords(std::move(rows));
+    shownRows = sortedJobs.Rows(serverFilterActive, serverFilter);
+    const long count = static_cast<long>(shownRows->GetRowCount());
+    jobList->SetRowSource(shownRows);
     jobList->RefreshItems(0, std::max(0L, count - 1));
     jobList->SetItemCount(count);
     SelectKey(selectedKey);
@@ -199,23 +196,15 @@ void JobStatusView::BuildRows()
 wxString JobStatusView::SelectedKey() const
 {
     const long selected = jobList->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED);
-    const std::vector<JobRecord>& rows = jobList->GetRecords();
-    if (selected < 0 || static_cast<std::size_t>(selected) >= rows.size())
+    if (!shownRows || selected < 0 || static_cast<std::size_t>(selected) >= shownRows->GetRowCount())
         return wxString();
-    return rows[selected][0];
+    return shownRows->KeyAt(static_cast<std::size_t>(selected));
 }
 
 void JobStatusView::SelectKey(const wxString& key)
 {
     const long selected = jobList->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED);
-    long found = -1;
-    if (!key.empty())
-    {
-        const std::vector<JobRecord>& rows = jobList->GetRecords();
-        const auto at = std::find_if(rows.begin(), rows.end(), [&](const JobRecord& row) { return row[0] == key; });
-        if (at != rows.end())
-            found = static_cast<long>(at - rows.begin());
-    }
+    const long found = key.empty() || !shownRows ? -1 : shownRows->FindKey(key);
     if (found == selected)
         return;
     if (selected >= 0)
@@ -248,7 +237,6 @@ void JobStatusView::OnServerSelected(wxCommandEvent&)
     serverFilter = text;
     const wxString selectedKey = SelectedKey();
     jobList->DeleteAllItems();
-    jobList->SetRecords(std::vector<JobRecord>());
     RefreshFromModel();
     SelectKey(selectedKey);
     const long selected = jobList->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED);

@@ -72,6 +72,8 @@ private:
     bool serverFilterActive = false;
     wxString serverFilter;
     StatusTable sortedJobs;
+    // What the list shows now: the rows of the last BuildRows.
+    std::shared_ptr<const StatusRows> shownRows;
     // Before any click: File Name, ascending.
     viewrules::ColumnSortState sortState{7, 1, false};
     std::int32_t animationFrame = 0;

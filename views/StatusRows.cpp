@@ -18,7 +18,7 @@ constexpr std::size_t kSortField[] = {StatusField::FilePath, StatusField::Format
 constexpr int kTimeColumn = 6;
 
 // Equal ignoring case once trailing white space is gone from `text`;
-// `trimmedFilter` has none. Compares in place: the filter runs once per row.
+// `trimmedFilter` has none. Compares in place: the filter runs once per job.
 bool ServerMatches(const wxString& text, const wxString& trimmedFilter)
 {
     std::size_t length = text.length();
@@ -50,51 +50,32 @@ const wxString& TranslationMemo::Translate(const wxString& english)
     return known.back().second;
 }
 
-void StatusTable::Replace(std::vector<JobRecord>& newJobs, std::vector<std::uint64_t>& newStartTimes)
+StatusRows::StatusRows(std::shared_ptr<const std::vector<JobRecord>> jobs, std::vector<std::size_t> shown)
+    : jobs(std::move(jobs)), shown(std::move(shown))
 {
-    jobs.swap(newJobs);
-    startTimes.swap(newStartTimes);
-    newJobs.clear();
-    newStartTimes.clear();
-    // A model without times orders Time by journal order alone.
-    startTimes.resize(jobs.size(), 0);
-    order.resize(jobs.size());
-    std::iota(order.begin(), order.end(), std::size_t{0});
 }
 
-void StatusTable::Sort(int column, bool descending)
+void StatusRows::MakeRow(std::size_t index, JobRecord& row) const
 {
-    if (column < 1 || column > static_cast<int>(std::size(kSortField)))
-        return;
-    if (column == kTimeColumn)
+    MakeDisplayRow((*jobs)[shown[index]], translations, row);
+}
+
+long StatusRows::FindKey(const wxString& key) const
+{
+    for (std::size_t index = 0; index < shown.size(); ++index)
     {
-        order = viewrules::SortKeys(startTimes).Order(descending);
-        return;
+        if (KeyAt(index) == key)
+            return static_cast<long>(index);
     }
-    const std::size_t field = kSortField[column - 1];
-    const viewrules::SortKeys keys(jobs.size(), viewrules::SortKind::Text,
-                                   [&](std::size_t i) -> const wxString& { return jobs[i][field]; });
-    order = keys.Order(descending);
+    return -1;
 }
 
-std::vector<JobRecord> StatusTable::BuildRows(bool filterActive, const wxString& serverFilter)
+const wxString& StatusRows::KeyAt(std::size_t index) const
 {
-    const wxString filter = viewrules::TrimmedRight(serverFilter);
-    std::vector<JobRecord> rows;
-    rows.reserve(order.size());
-    for (const std::size_t index : order)
-    {
-        const JobRecord& job = jobs[index];
-        if (filterActive && !ServerMatches(job[StatusField::Server], filter))
-            continue;
-        // Built where it is kept: a JobRecord moved is a JobRecord copied.
-        rows.emplace_back();
-        MakeDisplayRow(job, translations, rows.back());
-    }
-    return rows;
+    return (*jobs)[shown[index]][StatusField::Key];
 }
 
-void StatusTable::MakeDisplayRow(const JobRecord& job, TranslationMemo& translations, JobRecord& row)
+void StatusRows::MakeDisplayRow(const JobRecord& job, TranslationMemo& translations, JobRecord& row)
 {
     row[0] = job[StatusField::Key];
     row[1] = viewrules::FileTitle(job[StatusField::FilePath]);
@@ -104,4 +85,45 @@ void StatusTable::MakeDisplayRow(const JobRecord& job, TranslationMemo& translat
     row[5] = job[StatusField::Format];
     row[6] = job[StatusField::TimeText];
     row[7] = translations.Translate(job[StatusField::Status]);
+}
+
+void StatusTable::Replace(std::shared_ptr<const JobSnapshot> read)
+{
+    snapshot = read ? std::move(read) : std::make_shared<JobSnapshot>();
+    jobs = std::shared_ptr<const std::vector<JobRecord>>(snapshot, &snapshot->jobs);
+    order.resize(jobs->size());
+    std::iota(order.begin(), order.end(), std::size_t{0});
+}
+
+void StatusTable::Sort(int column, bool descending)
+{
+    if (column < 1 || column > static_cast<int>(std::size(kSortField)))
+        return;
+    if (column == kTimeColumn)
+    {
+        // A read without times orders Time by journal order alone.
+        std::vector<std::uint64_t> started = snapshot->startTimes;
+        started.resize(jobs->size(), 0);
+        order = viewrules::SortKeys(std::move(started)).Order(descending);
+        return;
+    }
+    const std::size_t field = kSortField[column - 1];
+    const std::vector<JobRecord>& records = *jobs;
+    const viewrules::SortKeys keys(records.size(), viewrules::SortKind::Text,
+                                   [&](std::size_t i) -> const wxString& { return records[i][field]; });
+    order = keys.Order(descending);
+}
+
+std::shared_ptr<const StatusRows> StatusTable::Rows(bool filterActive, const wxString& serverFilter) const
+{
+    if (!filterActive)
+        return std::make_shared<StatusRows>(jobs, order);
+    const wxString filter = viewrules::TrimmedRight(serverFilter);
+    std::vector<std::size_t> shown;
+    for (const std::size_t index : order)
+    {
+        if (ServerMatches((*jobs)[index][StatusField::Server], filter))
+            shown.push_back(index);
+    }
+    return std::make_shared<StatusRows>(jobs, std::move(shown));
 }

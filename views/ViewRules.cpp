@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdlib>
+#include <cwchar>
 #include <numeric>
 
 namespace viewrules
@@ -111,34 +112,50 @@ std::uint64_t SortNumber(const wxString& text)
     return LeadingDecimal(text.wc_str(), text.length());
 }
 
-std::wstring SortKeys::Fold(const wxString& text)
+void SortKeys::AppendFolded(const wxString& text, std::wstring& to)
 {
-    std::wstring folded = text.ToStdWstring();
-    for (wchar_t& c : folded)
-        c = static_cast<wchar_t>(wxTolower(c));
-    return folded;
+    const wchar_t* characters = text.wc_str();
+    const std::size_t length = text.length();
+    for (std::size_t i = 0; i < length; ++i)
+    {
+        const wchar_t c = characters[i];
+        // Most paths are ASCII: fold those without asking the locale.
+        if (c < 0x80)
+            to.push_back(c >= L'A' && c <= L'Z' ? static_cast<wchar_t>(c + (L'a' - L'A')) : c);
+        else
+            to.push_back(static_cast<wchar_t>(wxTolower(c)));
+    }
+}
+
+int SortKeys::CompareTexts(std::size_t a, std::size_t b) const
+{
+    const auto& [startA, lengthA] = spans[a];
+    const auto& [startB, lengthB] = spans[b];
+    const int common = std::wmemcmp(folded.data() + startA, folded.data() + startB, std::min(lengthA, lengthB));
+    if (common != 0)
+        return common;
+    return lengthA < lengthB ? -1 : lengthA > lengthB ? 1 : 0;
 }
 
 std::vector<std::size_t> SortKeys::Order(bool descending) const
 {
-    const std::size_t count = kind == SortKind::Text ? texts.size() : numbers.size();
+    const std::size_t count = kind == SortKind::Text ? spans.size() : numbers.size();
     std::vector<std::size_t> order(count);
     std::iota(order.begin(), order.end(), std::size_t{0});
-    auto compare = [&](auto before)
-    { std::stable_sort(order.begin(), order.end(), before); };
+    auto sort = [&](auto before) { std::stable_sort(order.begin(), order.end(), before); };
     if (kind == SortKind::Text)
     {
         if (descending)
-            compare([this](std::size_t a, std::size_t b) { return texts[a] > texts[b]; });
+            sort([this](std::size_t a, std::size_t b) { return CompareTexts(a, b) > 0; });
         else
-            compare([this](std::size_t a, std::size_t b) { return texts[a] < texts[b]; });
+            sort([this](std::size_t a, std::size_t b) { return CompareTexts(a, b) < 0; });
     }
     else
     {
         if (descending)
-            compare([this](std::size_t a, std::size_t b) { return numbers[a] > numbers[b]; });
+            sort([this](std::size_t a, std::size_t b) { return numbers[a] > numbers[b]; });
         else
-            compare([this](std::size_t a, std::size_t b) { return numbers[a] < numbers[b]; });
+            sort([this](std::size_t a, std::size_t b) { return numbers[a] < numbers[b]; });
     }
     return order;
 }

@@ -55,8 +55,8 @@ enum class SortKind
 std::uint64_t SortNumber(const wxString& text);
 
 // Sort keys computed once per record, so a sort of n records folds and reads
-// n texts, not n log n. Ties keep the records' own order, so rows that
-// compare equal do not change places between updates.
+// n texts, not n log n. Folded texts share one buffer. Ties keep the records'
+// own order, so rows that compare equal do not change places between updates.
 class SortKeys
 {
 public:
@@ -66,9 +66,13 @@ public:
     {
         if (kind == SortKind::Text)
         {
-            texts.reserve(count);
+            spans.reserve(count);
             for (std::size_t i = 0; i < count; ++i)
-                texts.push_back(Fold(value(i)));
+            {
+                const std::size_t start = folded.size();
+                AppendFolded(value(i), folded);
+                spans.emplace_back(start, folded.size() - start);
+            }
         }
         else
         {
@@ -77,18 +81,22 @@ public:
                 numbers.push_back(SortNumber(value(i)));
         }
     }
-
     // Numbers already read, such as times the records do not carry as text.
     explicit SortKeys(std::vector<std::uint64_t> values) : kind(SortKind::Number), numbers(std::move(values)) {}
 
     // The record positions in sort order.
     std::vector<std::size_t> Order(bool descending) const;
 
-    static std::wstring Fold(const wxString& text);
+    // The text lower-cased character by character, as the case-insensitive
+    // comparison of the toolkit folds it.
+    static void AppendFolded(const wxString& text, std::wstring& to);
 
 private:
+    int CompareTexts(std::size_t a, std::size_t b) const;
+
     SortKind kind;
-    std::vector<std::wstring> texts;
+    std::wstring folded;
+    std::vector<std::pair<std::size_t, std::size_t>> spans;
     std::vector<std::uint64_t> numbers;
 };
 

@@ -7,6 +7,8 @@ namespace
 // Display-row field shown in each column; column 0 is the row number.
 constexpr std::size_t kFieldOfColumn[] = {0, 1, 5, 2, 3, 4, 6, 7};
 constexpr long kColumnCount = sizeof(kFieldOfColumn) / sizeof(kFieldOfColumn[0]);
+// About ten pages of rows.
+constexpr std::size_t kMadeRowsKept = 512;
 } // namespace
 
 CustomListCtrl::CustomListCtrl()
@@ -24,13 +26,17 @@ CustomListCtrl::CustomListCtrl(const headerStyle* style, wxWindow* parent, wxWin
 
 void CustomListCtrl::SetRecords(const std::vector<JobRecord>& rows)
 {
+    rowSource.reset();
+    madeRows.clear();
     records = rows;
 }
 
-void CustomListCtrl::SetRecords(std::vector<JobRecord>&& rows)
+void CustomListCtrl::SetRowSource(std::shared_ptr<const JobRowSource> source)
 {
-    records.swap(rows);
-    rows.clear();
+    records.clear();
+    records.shrink_to_fit();
+    madeRows.clear();
+    rowSource = std::move(source);
 }
 
 void CustomListCtrl::SetStatusImage(std::int32_t image)
@@ -38,26 +44,50 @@ void CustomListCtrl::SetStatusImage(std::int32_t image)
     statusImage = image;
 }
 
+std::size_t CustomListCtrl::GetRowCount() const
+{
+    return rowSource ? rowSource->GetRowCount() : records.size();
+}
+
+const JobRecord* CustomListCtrl::GetRow(long item) const
+{
+    if (item < 0 || static_cast<std::size_t>(item) >= GetRowCount())
+        return nullptr;
+    const auto index = static_cast<std::size_t>(item);
+    if (!rowSource)
+        return &records[index];
+    auto made = madeRows.find(index);
+    if (made == madeRows.end())
+    {
+        if (madeRows.size() >= kMadeRowsKept)
+            madeRows.clear();
+        made = madeRows.try_emplace(index).first;
+        rowSource->MakeRow(index, made->second);
+    }
+    return &made->second;
+}
+
 wxString CustomListCtrl::OnGetItemText(long item, long column) const
 {
-    if (item < 0 || static_cast<std::size_t>(item) >= records.size() || column < 0 || column >= kColumnCount)
+    const JobRecord* row = GetRow(item);
+    if (!row || column < 0 || column >= kColumnCount)
         return wxString();
     if (column == 0)
         return wxString::Format(wxS("%ld"), item + 1);
-    return records[item][kFieldOfColumn[column]];
+    return (*row)[kFieldOfColumn[column]];
 }
 
 int CustomListCtrl::OnGetItemImage(long item, long column) const
 {
-    if (column != kStatusColumn || item < 0 || static_cast<std::size_t>(item) >= records.size())
+    if (column != kStatusColumn)
         return kCellImageNone;
     return IsRowInProgress(item) ? statusImage : kCellImageNone;
 }
 
 bool CustomListCtrl::IsRowInProgress(long item) const
 {
-    return item >= 0 && static_cast<std::size_t>(item) < records.size() &&
-           IsInProgress(records[item][StatusField::Status]);
+    const JobRecord* row = GetRow(item);
+    return row && IsInProgress((*row)[StatusField::Status]);
 }
 
 bool CustomListCtrl::IsInProgress(const wxString& status) const

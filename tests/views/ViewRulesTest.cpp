@@ -166,18 +166,25 @@ JobRecord Job(const char* key, const char* file, const char* server, const char*
     return {key, wxString("/srv/in/Proofs/") + file, "/srv/in/Proofs", server, size, "PDF", "12/06/26", status};
 }
 
-TEST(StatusTable, BuildsDisplayRowsInSortOrderForTheChosenServer)
+std::vector<JobRecord> Shown(const StatusRows& rows)
 {
-    std::vector<JobRecord> jobs = {Job("1", "b.pdf", "SRV1 ", "2048", "Saving..."),
-                                   Job("2", "A.pdf", "srv2", "N/A", "Queued"),
-                                   Job("3", "c.tiff", "srv1", "1048577", "Transferring to server")};
-    std::vector<std::uint64_t> started = {30, 10, 20};
+    std::vector<JobRecord> made(rows.GetRowCount());
+    for (std::size_t i = 0; i < made.size(); ++i)
+        rows.MakeRow(i, made[i]);
+    return made;
+}
+
+TEST(StatusTable, ShowsDisplayRowsInSortOrderForTheChosenServer)
+{
+    auto read = std::make_shared<JobSnapshot>();
+    read->jobs = {Job("1", "b.pdf", "SRV1 ", "2048", "Saving..."), Job("2", "A.pdf", "srv2", "N/A", "Queued"),
+                  Job("3", "c.tiff", "srv1", "1048577", "Transferring to server")};
+    read->startTimes = {30, 10, 20};
     StatusTable table;
-    table.Replace(jobs, started);
-    EXPECT_TRUE(jobs.empty());
+    table.Replace(read);
 
     table.Sort(1, false);
-    std::vector<JobRecord> rows = table.BuildRows(false, wxString());
+    std::vector<JobRecord> rows = Shown(*table.Rows(false, wxString()));
     ASSERT_EQ(rows.size(), 3u);
     EXPECT_EQ(rows[0], (JobRecord{"2", "A", "Proofs", "srv2", "N/A", "PDF", "12/06/26", "Queued"}));
     EXPECT_EQ(rows[1][1], "b");
@@ -185,13 +192,21 @@ TEST(StatusTable, BuildsDisplayRowsInSortOrderForTheChosenServer)
     EXPECT_EQ(rows[2][4], "1.00MB");
 
     table.Sort(6, true); // Time: latest start first
-    rows = table.BuildRows(true, "srv1");
+    const auto srv1 = table.Rows(true, "srv1");
+    rows = Shown(*srv1);
     ASSERT_EQ(rows.size(), 2u);
     EXPECT_EQ(rows[0][0], "1");
     EXPECT_EQ(rows[1][0], "3");
+    EXPECT_EQ(srv1->FindKey("3"), 1);
+    EXPECT_EQ(srv1->FindKey("2"), -1) << "filtered out";
 
     table.Sort(0, true); // not a sortable column: the order stays
     EXPECT_EQ(table.SortedJob(0)[0], "1");
+
+    table.Replace(std::make_shared<JobSnapshot>());
+    EXPECT_EQ(table.Size(), 0u);
+    EXPECT_EQ(srv1->GetRowCount(), 2u) << "rows handed out keep their jobs";
+    EXPECT_EQ(Shown(*srv1)[1][0], "3");
 }
 
 } // namespace
