@@ -1,25 +1,16 @@
 #include "app/MainFrame.h"
 
 #include "app/MainView.h"
-#include "platform/themer/Themer.h"
+#include "views/JobLogView.h"
 #include "views/JobStatusView.h"
 #include "views/ViewMetrics.h"
 
 #include <wx/intl.h>
-#include <wx/panel.h>
 #include <wx/sizer.h>
 
 namespace
 {
 constexpr wxWindowID kNotebookId = 5001;
-
-// Stands in for a view that has not been written yet.
-wxWindow* CreatePlaceholderPage(wxWindow* parent)
-{
-    auto* page = new wxPanel(parent, wxID_ANY);
-    page->SetBackgroundColour(Themer::GetThemeService()->GetTheme("Default").backgroundColour);
-    return page;
-}
 } // namespace
 
 wxBEGIN_EVENT_TABLE(CMainFrame, wxFrame) wxEND_EVENT_TABLE()
@@ -40,7 +31,7 @@ void CMainFrame::BuildLayout()
                        "CNOwnerDrawNotebook");
     m_statusView = new JobStatusView(m_notebook, wxID_ANY);
     m_notebook->AddPage(m_statusView, _("Status"), false, 1, nullptr, -1, false);
-    m_logView = CreatePlaceholderPage(m_notebook);
+    m_logView = new JobLogView(m_notebook, wxID_ANY);
     m_notebook->AddPage(m_logView, _("Log"), false, 2, nullptr, -1, false);
     m_notebook->SetSelection(0);
 
