@@ -454,6 +454,27 @@ std::size_t JobLogManager::GetRecordsSince(std::uint64_t& cursor, std::vector<Jo
     return static_cast<std::size_t>(end - from);
 }
 
+std::size_t JobLogManager::GetRecordsSince(std::uint64_t& cursor, std::vector<JobRecord>& records,
+                                           const std::function<bool(const JobRecord&)>& take) const
+{
+    std::lock_guard<std::mutex> guard(m_lock);
+    const std::uint64_t end = m_firstSequence + m_records.size();
+    const std::uint64_t from = std::min(std::max(cursor, m_firstSequence), end);
+    // Chosen first and copied after: reserved in full, the vector never copies
+    // a record twice (wxString has no move).
+    std::vector<std::size_t> chosen;
+    for (std::size_t i = static_cast<std::size_t>(from - m_firstSequence); i < m_records.size(); ++i)
+    {
+        if (take(m_records[i]))
+            chosen.push_back(i);
+    }
+    records.reserve(records.size() + chosen.size());
+    for (const std::size_t i : chosen)
+        records.push_back(m_records[i]);
+    cursor = end;
+    return chosen.size();
+}
+
 int JobLogManager::GetHotFolderNames(wxArrayString& names) const
 {
     names.clear();

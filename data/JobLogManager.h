@@ -66,6 +66,12 @@ public:
     // list; after ClearLog it gets only what came in since. Unlike GetNewRecords,
     // nothing is missed when the view handles an update after further reads.
     std::size_t GetRecordsSince(std::uint64_t& cursor, std::vector<JobRecord>& records) const;
+    // The same, but copies only the records `take` accepts; `take` sees every
+    // record since the cursor, in order, under the model's lock. Returns how
+    // many were copied. A view relisting 100,000 records under a filter copies
+    // only those it lists.
+    std::size_t GetRecordsSince(std::uint64_t& cursor, std::vector<JobRecord>& records,
+                                const std::function<bool(const JobRecord&)>& take) const;
 
     // The display name (last path component) of every configured hot folder; returns 1.
     int GetHotFolderNames(wxArrayString& names) const;

@@ -243,12 +243,20 @@ void JobLogView::Reload(bool acknowledge)
     logList->DeleteAllItems();
     rowRecords.clear();
     std::vector<JobRecord> records;
+    logrows::FoldersToAcknowledge folders(filter);
     // From the start, so the cursor and the rows agree: an update queued
-    // meanwhile brings only what came in after this.
+    // meanwhile brings only what came in after this. Only listed records are
+    // copied; the folders to acknowledge are noted from all of them.
     cursor = 0;
-    model.GetRecordsSince(cursor, records);
+    model.GetRecordsSince(cursor, records,
+                          [&](const JobRecord& record)
+                          {
+                              if (acknowledge)
+                                  folders.Note(record);
+                              return filter.Shows(record);
+                          });
     if (acknowledge)
-        AcknowledgeShownFolders(records);
+        AcknowledgeShownFolders(folders.Folders());
     AppendRows(records);
     ShowErrorPanel(false);
     UpdateFooterWithSelection();
@@ -256,9 +264,9 @@ void JobLogView::Reload(bool acknowledge)
     Refresh();
 }
 
-void JobLogView::AcknowledgeShownFolders(const std::vector<JobRecord>& records)
+void JobLogView::AcknowledgeShownFolders(const std::vector<wxString>& folders)
 {
-    for (const wxString& folder : logrows::FoldersToAcknowledge(records, filter))
+    for (const wxString& folder : folders)
         model.AcknowledgeFolderErrors(folder);
 }
 

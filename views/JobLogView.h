@@ -82,7 +82,7 @@ private:
     // their texts, leaving the records empty. Returns how many were listed.
     std::size_t AppendRows(std::vector<JobRecord>& records);
     ProfilesKelvoListLineData MakeLine(const JobRecord& row, long index);
-    void AcknowledgeShownFolders(const std::vector<JobRecord>& records);
+    void AcknowledgeShownFolders(const std::vector<wxString>& folders);
     void ShowSortMark(int column, bool descending);
     void RefreshFolderList();
     void ClearAll();

@@ -2,7 +2,7 @@
 
 #include "views/ViewRules.h"
 
-#include <unordered_set>
+#include <wx/wxcrt.h>
 
 namespace logrows
 {
@@ -11,7 +11,12 @@ const wxString kSucceeded = wxS("Transferred Successfully");
 
 bool IsFailed(const JobRecord& record)
 {
-    return viewrules::TrimmedRight(record[LogField::Status]) != kSucceeded;
+    // Compared in place: asked for every record of a relisting.
+    const wxString& status = record[LogField::Status];
+    std::size_t end = status.length();
+    while (end > 0 && wxIsspace(status[end - 1]))
+        --end;
+    return end != kSucceeded.length() || status.compare(0, end, kSucceeded) != 0;
 }
 
 bool LogFilter::Shows(const JobRecord& record) const
@@ -60,23 +65,17 @@ void FillCells(const JobRecord& row, StatusTexts& statuses, LogRowCells& cells)
     cells.texts[StatusColumn] = statuses.Translated(row[LogField::Status]);
 }
 
-std::vector<wxString> FoldersToAcknowledge(const std::vector<JobRecord>& records, const LogFilter& filter)
+void FoldersToAcknowledge::Note(const JobRecord& record)
 {
-    std::vector<wxString> folders;
-    std::unordered_set<wxString> seen;
-    for (const JobRecord& record : records)
+    const wxString& folder = record[LogField::HotFolderPath];
+    if (filter.byFolder)
     {
-        const wxString& folder = record[LogField::HotFolderPath];
-        if (filter.byFolder)
-        {
-            if (viewrules::SameFilterText(viewrules::LastPathComponent(folder), filter.folder))
-                return {folder};
-            continue;
-        }
-        if (seen.insert(folder).second)
+        if (folders.empty() && viewrules::SameFilterText(viewrules::LastPathComponent(folder), filter.folder))
             folders.push_back(folder);
+        return;
     }
-    return folders;
+    if (seen.insert(folder).second)
+        folders.push_back(folder);
 }
 
 std::vector<std::size_t> SortOrder(const std::deque<JobRecord>& rows, int column, bool descending)

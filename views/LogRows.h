@@ -8,6 +8,7 @@
 #include <deque>
 #include <functional>
 #include <unordered_map>
+#include <unordered_set>
 #include <vector>
 
 // What the Log tab makes of log records, free of windows: which records it
@@ -79,10 +80,22 @@ struct LogRowCells
 // translated status.
 void FillCells(const JobRecord& row, StatusTexts& statuses, LogRowCells& cells);
 
-// The hot folders whose errors the error log acknowledges: every distinct
-// folder (case-sensitive) of the records in first-seen order, or with a folder
-// filter only the first folder of that name.
-std::vector<wxString> FoldersToAcknowledge(const std::vector<JobRecord>& records, const LogFilter& filter);
+// The hot folders whose errors the error log acknowledges, from the records
+// as they come: every distinct folder (case-sensitive) in first-seen order, or
+// with a folder filter only the first folder of that name.
+class FoldersToAcknowledge
+{
+public:
+    explicit FoldersToAcknowledge(const LogFilter& filter) : filter(filter) {}
+
+    void Note(const JobRecord& record);
+    const std::vector<wxString>& Folders() const { return folders; }
+
+private:
+    const LogFilter& filter;
+    std::vector<wxString> folders;
+    std::unordered_set<wxString> seen;
+};
 
 // The order of the rows sorted by a list column (1 to 5): texts ignoring case,
 // "Start Time" by its MS-DOS time. Ties keep their order.

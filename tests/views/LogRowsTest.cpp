@@ -160,11 +160,12 @@ class LogAcknowledgement : public ::testing::TestWithParam<AcknowledgeCase>
 TEST_P(LogAcknowledgement, FoldersInFirstSeenOrderOrTheChosenOne)
 {
     const AcknowledgeCase& c = GetParam();
-    std::vector<JobRecord> records;
+    const LogFilter filter{true, c.byFolder, c.filterFolder};
+    logrows::FoldersToAcknowledge folders(filter);
     for (const char* folder : c.recordFolders)
-        records.push_back(Record(wxS("1"), folder, wxS("/x/a.pdf"), wxS("Transferred Successfully")));
+        folders.Note(Record(wxS("1"), folder, wxS("/x/a.pdf"), wxS("Transferred Successfully")));
     const std::vector<wxString> expected(c.acknowledged.begin(), c.acknowledged.end());
-    EXPECT_EQ(expected, logrows::FoldersToAcknowledge(records, LogFilter{true, c.byFolder, c.filterFolder}));
+    EXPECT_EQ(expected, folders.Folders());
 }
 
 INSTANTIATE_TEST_SUITE_P(
