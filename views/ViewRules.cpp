@@ -7,7 +7,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdlib>
-#include <cwchar>
+#include <cstring>
 #include <numeric>
 
 namespace viewrules
@@ -112,7 +112,7 @@ std::uint64_t SortNumber(const wxString& text)
     return LeadingDecimal(text.wc_str(), text.length());
 }
 
-void SortKeys::AppendFolded(const wxString& text, std::wstring& to)
+void SortKeys::AppendFolded(const wxString& text, std::string& to)
 {
     const wchar_t* characters = text.wc_str();
     const std::size_t length = text.length();
@@ -121,9 +121,29 @@ void SortKeys::AppendFolded(const wxString& text, std::wstring& to)
         const wchar_t c = characters[i];
         // Most paths are ASCII: fold those without asking the locale.
         if (c < 0x80)
-            to.push_back(c >= L'A' && c <= L'Z' ? static_cast<wchar_t>(c + (L'a' - L'A')) : c);
+        {
+            to.push_back(static_cast<char>(c >= L'A' && c <= L'Z' ? c + (L'a' - L'A') : c));
+            continue;
+        }
+        const auto code = std::min<std::uint32_t>(static_cast<std::uint32_t>(wxTolower(c)), 0x10FFFF);
+        if (code < 0x800)
+        {
+            to.push_back(static_cast<char>(0xC0 | code >> 6));
+        }
         else
-            to.push_back(static_cast<wchar_t>(wxTolower(c)));
+        {
+            if (code < 0x10000)
+            {
+                to.push_back(static_cast<char>(0xE0 | code >> 12));
+            }
+            else
+            {
+                to.push_back(static_cast<char>(0xF0 | code >> 18));
+                to.push_back(static_cast<char>(0x80 | (code >> 12 & 0x3F)));
+            }
+            to.push_back(static_cast<char>(0x80 | (code >> 6 & 0x3F)));
+        }
+        to.push_back(static_cast<char>(0x80 | (code & 0x3F)));
     }
 }
 
@@ -131,7 +151,7 @@ int SortKeys::CompareTexts(std::size_t a, std::size_t b) const
 {
     const auto& [startA, lengthA] = spans[a];
     const auto& [startB, lengthB] = spans[b];
-    const int common = std::wmemcmp(folded.data() + startA, folded.data() + startB, std::min(lengthA, lengthB));
+    const int common = std::memcmp(folded.data() + startA, folded.data() + startB, std::min(lengthA, lengthB));
     if (common != 0)
         return common;
     return lengthA < lengthB ? -1 : lengthA > lengthB ? 1 : 0;
