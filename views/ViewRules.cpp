@@ -75,8 +75,9 @@ wxArrayString MergeFilterEntries(const wxArrayString& entries, const wxArrayStri
     for (const wxString& name : names)
     {
         const wxString trimmed = TrimmedRight(name);
-        const bool present = std::any_of(merged.begin(), merged.end(), [&](const wxString& entry)
-                                         { return TrimmedRight(entry).CmpNoCase(trimmed) == 0; });
+        const bool present =
+            std::any_of(merged.begin(), merged.end(),
+                        [&](const wxString& entry) { return TrimmedRight(entry).CmpNoCase(trimmed) == 0; });
         if (!present)
             merged.Add(trimmed);
     }
@@ -151,7 +152,8 @@ int SortKeys::CompareTexts(std::size_t a, std::size_t b) const
 {
     const auto& [startA, lengthA] = spans[a];
     const auto& [startB, lengthB] = spans[b];
-    const int common = std::memcmp(folded.data() + startA, folded.data() + startB, std::min(lengthA, lengthB));
+    const int common =
+        std::memcmp(folded.data() + startA, folded.data() + startB, std::min(lengthA, lengthB));
     if (common != 0)
         return common;
     return lengthA < lengthB ? -1 : lengthA > lengthB ? 1 : 0;

@@ -61,8 +61,7 @@ class SortKeys
 {
 public:
     // `value(i)` gives the field of record i.
-    template <typename Value>
-    SortKeys(std::size_t count, SortKind kind, Value value) : kind(kind)
+    template <typename Value> SortKeys(std::size_t count, SortKind kind, Value value) : kind(kind)
     {
         if (kind == SortKind::Text)
         {
@@ -86,7 +85,9 @@ public:
         }
     }
     // Numbers already read, such as times the records do not carry as text.
-    explicit SortKeys(std::vector<std::uint64_t> values) : kind(SortKind::Number), numbers(std::move(values)) {}
+    explicit SortKeys(std::vector<std::uint64_t> values) : kind(SortKind::Number), numbers(std::move(values))
+    {
+    }
 
     // The record positions in sort order.
     std::vector<std::size_t> Order(bool descending) const;

@@ -49,7 +49,10 @@ public:
     bool Ready() const { return window != 0; }
 
     // The "No." column and the footer: they change exactly when the row count does.
-    std::vector<unsigned char> Picture() { return x.Brightness(window, 4, 0, 30, x.Attributes(window).height); }
+    std::vector<unsigned char> Picture()
+    {
+        return x.Brightness(window, 4, 0, 30, x.Attributes(window).height);
+    }
 
     std::vector<unsigned char> SteadyPicture()
     {
@@ -113,8 +116,9 @@ void WrittenLineToShownRow(benchmark::State& state)
         ::usleep(static_cast<useconds_t>(pause(random)) * 1000);
         const bool written =
             shown ? session.Journal({"status", "delete", "42"})
-                  : session.Journal({"status", "add",
-                                     "42\t/srv/in/Proofs\t/srv/in/Proofs/a.pdf\tPRN-01\t1383035055\tQueued\t4096\tPDF"});
+                  : session.Journal(
+                        {"status", "add",
+                         "42\t/srv/in/Proofs\t/srv/in/Proofs/a.pdf\tPRN-01\t1383035055\tQueued\t4096\tPDF"});
         const Clock::time_point at = Clock::now();
         std::vector<unsigned char> after;
         const double seconds = written ? session.WaitForChange(picture, after, at) : -1;

@@ -128,7 +128,8 @@ void StatusUpdateFirstWritten(benchmark::State& state)
         std::vector<JobRecord> jobs;
         bench.model->GetJobs(jobs);
         sortedJobs = jobs;
-        std::sort(sortedJobs.begin(), sortedJobs.end(), [](const JobRecord& a, const JobRecord& b)
+        std::sort(sortedJobs.begin(), sortedJobs.end(),
+                  [](const JobRecord& a, const JobRecord& b)
                   { return a[StatusField::FilePath].CmpNoCase(b[StatusField::FilePath]) < 0; });
         std::vector<JobRecord> rows;
         for (const JobRecord& job : sortedJobs)

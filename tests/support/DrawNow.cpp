@@ -14,7 +14,8 @@ wxImage DrawNow(wxWindow* window)
     using DrawFunction = void (*)(void* widget, cairo_t* cr);
     using ResizeFunction = void (*)(void* container);
     static const auto draw = reinterpret_cast<DrawFunction>(dlsym(RTLD_DEFAULT, "gtk_widget_draw"));
-    static const auto resize = reinterpret_cast<ResizeFunction>(dlsym(RTLD_DEFAULT, "gtk_container_check_resize"));
+    static const auto resize =
+        reinterpret_cast<ResizeFunction>(dlsym(RTLD_DEFAULT, "gtk_container_check_resize"));
     const wxSize size = window->GetSize();
     if (!draw || !resize || size.x <= 0 || size.y <= 0)
         return wxImage();

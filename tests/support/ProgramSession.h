@@ -185,9 +185,10 @@ public:
             for (int column = 0; column < width; ++column)
             {
                 const unsigned long pixel = XGetPixel(image, column, row);
-                levels.push_back(static_cast<unsigned char>(
-                    (channel(pixel, visual->red_mask) + channel(pixel, visual->green_mask) +
-                     channel(pixel, visual->blue_mask)) / 3));
+                levels.push_back(static_cast<unsigned char>((channel(pixel, visual->red_mask) +
+                                                             channel(pixel, visual->green_mask) +
+                                                             channel(pixel, visual->blue_mask)) /
+                                                            3));
             }
         XDestroyImage(image);
         return levels;

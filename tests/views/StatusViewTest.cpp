@@ -9,8 +9,8 @@
 
 #include "../listctrl/ListTestSupport.h"
 #include "../status/StatusTestSupport.h"
-#include "GuiTest.h"
 #include "DrawNow.h"
+#include "GuiTest.h"
 #include "ScreenGrab.h"
 
 #include <wx/frame.h>
@@ -25,8 +25,8 @@ namespace
 wxString Line(const wxString& key, const wxString& server, const wxString& status = "Queued",
               const wxString& dosTime = "1383035055", const wxString& size = "48213")
 {
-    return key + "\t/srv/in/Proofs\t/srv/in/Proofs/" + key + ".pdf\t" + server + "\t" + dosTime + "\t" + status +
-           "\t" + size + "\tPDF\tADDED\n";
+    return key + "\t/srv/in/Proofs\t/srv/in/Proofs/" + key + ".pdf\t" + server + "\t" + dosTime + "\t" +
+           status + "\t" + size + "\tPDF\tADDED\n";
 }
 
 bool SameImage(const wxImage& a, const wxImage& b)
@@ -189,8 +189,7 @@ TEST_F(StatusView, ServerListFollowsTheDataSourceAndKeepsAllServers)
 {
     wxCommandEvent press(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK);
     view->ProcessWindowEvent(press);
-    EXPECT_EQ(view->GetServerBox()->GetStrings(),
-              wxSplit("All Servers      ,srv1,srv2,SRV3", ','));
+    EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv1,srv2,SRV3", ','));
     statustest::SystemRoot::WriteFile(GetDataDirectory() + "HotFolders.ini", "[Servers]\nsrv2\n");
     view->ProcessWindowEvent(press);
     EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv2", ','));

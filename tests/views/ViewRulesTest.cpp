@@ -1,6 +1,6 @@
 // The rules the tab pages apply to records, without windows.
-#include "views/StatusRows.h"
 #include "views/ViewRules.h"
+#include "views/StatusRows.h"
 
 #include <gtest/gtest.h>
 
@@ -44,9 +44,10 @@ TEST(PathRules, NameTheFileAndTheFolderAsTheTableShowsThem)
         const char* last;
         const char* title;
     };
-    for (const Case& c : {Case{"/srv/in/Proofs/a.b.pdf", "a.b.pdf", "a.b"}, Case{"/srv/in/Proofs/", "Proofs", "Proofs"},
-                          Case{"/srv/in/.profile", ".profile", ".profile"}, Case{"report", "report", "report"},
-                          Case{"/", "", ""}, Case{"", "", ""}})
+    for (const Case& c :
+         {Case{"/srv/in/Proofs/a.b.pdf", "a.b.pdf", "a.b"}, Case{"/srv/in/Proofs/", "Proofs", "Proofs"},
+          Case{"/srv/in/.profile", ".profile", ".profile"}, Case{"report", "report", "report"},
+          Case{"/", "", ""}, Case{"", "", ""}})
     {
         EXPECT_EQ(LastPathComponent(c.path), c.last) << c.path;
         EXPECT_EQ(FileTitle(c.path), c.title) << c.path;
@@ -95,7 +96,8 @@ TEST(FilterRules, MergeAddsIgnoringCaseAndKeepsRespectingCase)
 TEST(FooterRules, CountAndSelectionInAnyOrderTheTranslationChooses)
 {
     EXPECT_EQ(CountFooter(3), "3 Items ");
-    EXPECT_EQ(SelectionFooter("[WYX3Value1] of [WYX3Value2] items selected.", 1, 12), "1 of 12 items selected.");
+    EXPECT_EQ(SelectionFooter("[WYX3Value1] of [WYX3Value2] items selected.", 1, 12),
+              "1 of 12 items selected.");
     EXPECT_EQ(SelectionFooter("[WYX3Value2] Zeilen, [WYX3Value1] markiert", 1, 12), "12 Zeilen, 1 markiert");
     EXPECT_EQ(SelectionFooter("[WYX3Value1]/[WYX3Value1]", 2, 5), "2/[WYX3Value1]");
 }
@@ -119,7 +121,8 @@ TEST(SortRules, NumbersReadAsUnsignedDecimalsAndUnreadableCountsAsZero)
 {
     const std::vector<const char*> values = {"1383035055", "x", "99", "18446744073709551616999"};
     const auto order =
-        SortKeys(values.size(), SortKind::Number, [&](std::size_t i) { return wxString(values[i]); }).Order(true);
+        SortKeys(values.size(), SortKind::Number, [&](std::size_t i) { return wxString(values[i]); })
+            .Order(true);
     EXPECT_EQ(order, (std::vector<std::size_t>{3, 0, 2, 1}));
 }
 
@@ -144,8 +147,8 @@ TEST(SortRules, EachColumnKeepsItsOwnAlternation)
         bool descending;
     };
     for (const Click& click : {Click{4, true, 4, true}, Click{2, true, 2, true}, Click{4, true, 4, false},
-                               Click{0, false, 4, false}, Click{-1, false, 4, false}, Click{8, false, 4, false},
-                               Click{4, true, 4, true}, Click{1, true, 1, true}})
+                               Click{0, false, 4, false}, Click{-1, false, 4, false},
+                               Click{8, false, 4, false}, Click{4, true, 4, true}, Click{1, true, 1, true}})
     {
         EXPECT_EQ(state.Click(click.column), click.accepted) << click.column;
         EXPECT_EQ(state.Column(), click.sorted) << click.column;
@@ -163,7 +166,8 @@ TEST(WidthRules, ScaleWithTheFontButNeverNarrower)
 // Status records as the model gives them: key, path, folder, server, size, format, time, status.
 JobRecord Job(const char* key, const char* file, const char* server, const char* size, const char* status)
 {
-    return {key, wxString("/srv/in/Proofs/") + file, "/srv/in/Proofs", server, size, "PDF", "12/06/26", status};
+    return {key,   wxString("/srv/in/Proofs/") + file, "/srv/in/Proofs", server, size, "PDF", "12/06/26",
+            status};
 }
 
 std::vector<JobRecord> Shown(const StatusRows& rows)
