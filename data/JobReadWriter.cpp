@@ -92,6 +92,17 @@ int EditLocked(const wxString& path, const std::atomic<bool>* keepWaiting, Acces
 
 } // namespace
 
+int JobsFileReadWriter::ReadJobsHoldingLock(wxArrayString& lines)
+{
+    if (m_path.empty())
+        return JobOk;
+    std::string bytes;
+    if (wyxos::ReadFileContents(m_path, bytes) != wyxos::ReadResult::Read)
+        return JobFileMissing;
+    DecodeJournalTexts(bytes.data(), bytes.size(), lines);
+    return JobOk;
+}
+
 int JobsFileReadWriter::ReadJobs(wxArrayString& lines)
 {
     if (m_path.empty())

@@ -55,6 +55,10 @@ public:
     // gives up with JobLockFailed instead of blocking. Null: wait for ever.
     void SetKeepWaiting(const std::atomic<bool>* keepWaiting) { m_keepWaiting = keepWaiting; }
 
+    // ReadJobs for a caller that already holds the journal's lock: it reads
+    // without taking the lock again, which would wait on the caller's own.
+    int ReadJobsHoldingLock(wxArrayString& lines);
+
 private:
     wxString m_path;
     const std::atomic<bool>* m_keepWaiting = nullptr;
