@@ -1,5 +1,7 @@
 #include "data/JobStatusManager.h"
 
+#include <ctime>
+
 #include <wx/event.h>
 #include <wx/filename.h>
 
@@ -53,7 +55,8 @@ void JobStatusManager::SetRunning(bool running)
     m_running = running;
 }
 
-JobStatusManager::ReadOutcome JobStatusManager::ReadChangedJournal(wxArrayString& lines)
+JobStatusManager::ReadOutcome JobStatusManager::ReadChangedJournal(wxArrayString& lines,
+                                                                   wyxos::FileStamp& readStamp)
 {
     // An unchanged stamp needs no lock: an idle poll is one stat.
     if (!m_reader)
@@ -62,24 +65,31 @@ JobStatusManager::ReadOutcome JobStatusManager::ReadChangedJournal(wxArrayString
     if (!seenNow.exists || seenNow == m_lastSeen)
         return ReadOutcome::Unchanged;
 
-    wyxos::FileStamp stamp;
-    {
-        // The producer holds the lock while it writes: a stamp taken under it
-        // is the stamp of a whole file.
-        named_mutex_lock lock(m_lockName);
-        if (!lock.try_lock())
-            return ReadOutcome::Unchanged;
-        stamp = wyxos::StatFile(m_journalPath);
-        if (!stamp.exists || stamp == m_lastSeen)
-            return ReadOutcome::Unchanged;
-    }
-
-    // A write between the check and the read only makes the next poll read once
-    // more: the stamp kept is never newer than the content read.
-    const int result = m_reader->ReadJobs(lines);
-    if (result == wyx::JobLockFailed)
+    // The producer holds the lock while it writes: a stamp taken under it is
+    // the stamp of a whole file, and the read happens under the same lock.
+    named_mutex_lock lock(m_lockName);
+    if (!lock.usable())
+        return ReadOutcome::Unreadable;
+    if (!lock.try_lock())
+        return ReadOutcome::Busy;
+    const wyxos::FileStamp stamp = wyxos::StatFile(m_journalPath);
+    if (!stamp.exists || stamp == m_lastSeen)
         return ReadOutcome::Unchanged;
-    m_lastSeen = stamp;
+
+    int result;
+    if (auto* file = dynamic_cast<wyx::JobsFileReadWriter*>(m_reader.get()))
+    {
+        result = file->ReadJobsHoldingLock(lines);
+    }
+    else
+    {
+        // A reader of another kind takes the lock itself.
+        lock.unlock();
+        result = m_reader->ReadJobs(lines);
+        if (result == wyx::JobLockFailed)
+            return ReadOutcome::Busy;
+    }
+    readStamp = stamp;
     return result == wyx::JobOk ? ReadOutcome::Read : ReadOutcome::Unreadable;
 }
 
@@ -87,8 +97,19 @@ int JobStatusManager::Parse()
 {
     std::lock_guard<std::mutex> parseGuard(m_parseLock);
     wxArrayString lines;
-    if (ReadChangedJournal(lines) != ReadOutcome::Read)
+    wyxos::FileStamp stamp;
+    const ReadOutcome outcome = ReadChangedJournal(lines, stamp);
+    if (outcome == ReadOutcome::Unreadable)
+        m_lastSeen = stamp; // wait for the next change
+    const std::time_t now = std::time(nullptr);
+    if (outcome == ReadOutcome::Busy && m_watch.NoteBusy(now))
+        m_watchChanged = true;
+    else if (outcome == ReadOutcome::Unreadable && m_watch.NoteUnreadable(now))
+        m_watchChanged = true;
+    if (outcome != ReadOutcome::Read)
         return 0;
+    if (m_watch.NoteRead(now))
+        m_watchChanged = true;
 
     auto fresh = std::make_shared<JobSnapshot>();
     std::vector<JobRecord>& jobs = fresh->jobs;
@@ -108,6 +129,10 @@ int JobStatusManager::Parse()
             jobs.pop_back();
     }
 
+    // A read cut short by a stop keeps what it has, and is read whole next time.
+    if (m_running)
+        m_lastSeen = stamp;
+
     std::shared_ptr<const JobSnapshot> released;
     {
         std::lock_guard<std::mutex> guard(m_lock);
@@ -123,11 +148,13 @@ int JobStatusManager::Parse()
 
 int JobStatusManager::Refresh()
 {
-    if (Parse() != 1)
+    const int parsed = Parse();
+    // A journal that turned busy or unreadable is news too: the view says so.
+    if (!m_watchChanged.exchange(false) && parsed != 1)
         return 0;
     wxCommandEvent event(wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS, 0);
     EventBus::Get().Publish(ChannelKey(kStatusChannel), event);
-    return 1;
+    return parsed;
 }
 
 int JobStatusManager::GetJobs(std::vector<JobRecord>& jobs, std::vector<std::uint64_t>* startTimes) const

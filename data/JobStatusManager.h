@@ -11,6 +11,7 @@
 
 #include "data/JobReadWriter.h"
 #include "data/JobRecord.h"
+#include "data/JournalWatch.h"
 #include "platform/os/FileStamp.h"
 
 // One read of the status journal: the jobs in journal order and, beside them,
@@ -41,7 +42,8 @@ public:
     JobStatusManager(const JobStatusManager&) = delete;
     JobStatusManager& operator=(const JobStatusManager&) = delete;
 
-    // 1 when the list was replaced and the views were told, else 0.
+    // 1 when the list was replaced and the views were told, else 0. The views
+    // are also told, with 0, when the journal turned busy, unreadable or readable again.
     int Refresh();
     // 1 when the list was replaced (also by an equal one), else 0.
     int Parse();
@@ -63,16 +65,20 @@ public:
     void SetRunning(bool running);
 
     const wxString& GetJournalPath() const { return m_journalPath; }
+    // Whether the latest polls could read the journal, for the view to say so.
+    JournalWatch::Report GetJournalReport() const { return m_watch.Get(); }
 
 private:
     enum class ReadOutcome
     {
-        Unchanged,  // missing, unchanged, or its lock is held: look again next time
-        Unreadable, // changed but could not be read: wait for the next change
+        Unchanged,  // missing or unchanged: look again next time
+        Busy,       // changed, but its lock is held: look again next time
+        Unreadable, // changed but could not be read (or its lock cannot be used): wait for the next change
         Read
     };
 
-    ReadOutcome ReadChangedJournal(wxArrayString& lines);
+    // readStamp: the stamp of what was read (or found unreadable).
+    ReadOutcome ReadChangedJournal(wxArrayString& lines, wyxos::FileStamp& readStamp);
 
     const wxString m_journalPath;
     const wxString m_lockName;
@@ -83,6 +89,8 @@ private:
     // the first poll whenever it was written.
     std::mutex m_parseLock;
     wyxos::FileStamp m_lastSeen;
+    // The journal's report changed since the views were last told.
+    std::atomic<bool> m_watchChanged{false};
 
     mutable std::mutex m_lock;
     std::shared_ptr<const JobSnapshot> m_snapshot = std::make_shared<JobSnapshot>();
@@ -90,4 +98,5 @@ private:
     // of it, so the polling thread frees it, not the GUI thread.
     std::shared_ptr<const JobSnapshot> m_previous;
     std::atomic<std::uint64_t> m_generation{0};
+    JournalWatch m_watch;
 };

@@ -37,6 +37,8 @@ public:
     bool lock(const std::atomic<bool>* keepWaiting = nullptr);
     // Does not wait.
     bool try_lock();
+    // False when the lock file could not be opened: nothing can ever take it.
+    bool usable() const { return m_mutex != nullptr; }
     void unlock();
 
 private:

@@ -18,12 +18,27 @@ namespace wyxos
 namespace
 {
 
-constexpr int kOpenFlags = O_RDONLY | O_CLOEXEC | O_NOFOLLOW;
+// Never blocks: another user may plant a FIFO where the lock file belongs.
+constexpr int kOpenFlags = O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK;
 constexpr mode_t kLockFileMode = 0666;
 // The lock folder is shared by every user, like /dev/shm itself.
 constexpr unsigned kLockFolderMode = 01777;
 // How long a cancellable wait sleeps between two attempts.
 constexpr std::chrono::milliseconds kPollInterval{20};
+
+// Only a regular file is a lock: a directory, FIFO or device planted in the
+// shared folder is refused, and the descriptor closed.
+int KeepIfRegularFile(int fd)
+{
+    struct stat info;
+    if (fd >= 0 && (::fstat(fd, &info) != 0 || !S_ISREG(info.st_mode)))
+    {
+        ::close(fd);
+        errno = EINVAL;
+        return -1;
+    }
+    return fd;
+}
 
 int OpenOrCreate(const wxScopedCharBuffer& path)
 {
@@ -40,7 +55,7 @@ int OpenOrCreate(const wxScopedCharBuffer& path)
             return -1;
         fd = ::open(path.data(), kOpenFlags);
         if (fd >= 0 || errno != ENOENT)
-            return fd;
+            return KeepIfRegularFile(fd);
     }
     return -1;
 }
@@ -83,15 +98,16 @@ bool LockFile(int descriptor, const std::atomic<bool>* keepWaiting)
         return false;
     if (keepWaiting == nullptr)
         return Flock(descriptor, LOCK_EX);
-    while (keepWaiting->load())
+    // One attempt whatever the flag says: a free lock is taken even by a
+    // caller that may no longer wait for a held one.
+    while (true)
     {
         if (Flock(descriptor, LOCK_EX | LOCK_NB))
             return true;
-        if (errno != EWOULDBLOCK)
+        if (errno != EWOULDBLOCK || !keepWaiting->load())
             return false;
         std::this_thread::sleep_for(kPollInterval);
     }
-    return false;
 }
 
 bool TryLockFile(int descriptor)

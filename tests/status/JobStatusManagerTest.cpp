@@ -212,24 +212,25 @@ TEST_F(StatusModel, TwoWritesInTheSameSecondAreBothSeen)
     EXPECT_EQ(Jobs(manager)[0][StatusField::Status], "Saving;..");
 }
 
-TEST_F(StatusModel, WhileStoppedAChangeWaitsAndIsReadOnceRunningAgain)
+TEST_F(StatusModel, WhileStoppedAFreeLockIsTakenAndTheCutReadIsReadWholeLater)
 {
     Write({StatusLine("1", "ADDED")});
     JobStatusManager manager(m_root.JournalPath());
     UpdateCounter updates;
     ASSERT_EQ(manager.Refresh(), 1);
 
-    // Stopping gives up the read instead of waiting for the journal's lock.
+    // Stopped, a free lock is still taken; the read stops at once and keeps
+    // what it has, and the journal counts as not yet read.
     manager.SetRunning(false);
     Write({StatusLine("1", "ADDED"), StatusLine("2", "ADDED")});
-    EXPECT_EQ(manager.Refresh(), 0);
-    EXPECT_EQ(Keys(manager), std::vector<wxString>{"1"});
-    EXPECT_EQ(updates.Delivered(), 1);
+    EXPECT_EQ(manager.Refresh(), 1);
+    EXPECT_EQ(Keys(manager), std::vector<wxString>{});
+    EXPECT_EQ(updates.Delivered(), 2);
 
     manager.SetRunning(true);
     EXPECT_EQ(manager.Refresh(), 1);
     EXPECT_EQ(Keys(manager), (std::vector<wxString>{"1", "2"}));
-    EXPECT_EQ(updates.Delivered(), 2);
+    EXPECT_EQ(updates.Delivered(), 3);
 }
 
 // A reader that hands out fixed results, and can stop the model while it reads.
