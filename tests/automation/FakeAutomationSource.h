@@ -1,0 +1,107 @@
+#pragma once
+
+#include "platform/automation/AutomationSource.h"
+#include "platform/automation/MemoryRegions.h"
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace automationtest
+{
+
+// A control made of plain fields, as a test or the fuzzer sets them.
+struct FakeSource : automation::AutomationSource
+{
+    automation::ControlKind kind = automation::ControlKind::ListCtrl;
+    std::uintptr_t handle = 0x1000;
+    std::vector<std::vector<std::u16string>> rows; // a box's entries are rows of one cell
+    std::vector<unsigned> states;
+    std::vector<automation::ColumnInfo> columns;
+    long current = -1;
+    long top = 0;
+    long lastVisible = -1;
+    bool singleSelection = true;
+    int rowHeight = 20;
+    int itemHeight = 18;
+    std::optional<int> headerHeight;
+    int scrolledLeft = 0;
+    bool dropped = false;
+    automation::Rect client{0, 0, 300, 200};
+    const FakeSource* header = nullptr;
+    const FakeSource* popup = nullptr;
+
+    automation::ControlKind Kind() const override { return kind; }
+    std::uintptr_t Handle() const override { return handle; }
+    long ItemCount() const override { return static_cast<long>(rows.size()); }
+    std::u16string ItemText(long item, int column) const override
+    {
+        if (item < 0 || item >= ItemCount() || column < 0 || size_t(column) >= rows[size_t(item)].size())
+            return std::u16string();
+        return rows[size_t(item)][size_t(column)];
+    }
+    long Current() const override { return current; }
+    long TopIndex() const override { return top; }
+    long LastVisible() const override { return lastVisible; }
+    unsigned ItemState(long item) const override
+    {
+        return item >= 0 && size_t(item) < states.size() ? states[size_t(item)] : 0;
+    }
+    int ItemImage(long item, int column) const override { return column == 1 ? 7 : -1; }
+    std::intptr_t ItemData(long item) const override { return 1000 + item; }
+    bool IsSingleSelection() const override { return singleSelection; }
+    long SelectedCount() const override
+    {
+        long count = 0;
+        for (unsigned state : states)
+            count += (state & automation::itemstate::kSelected) ? 1 : 0;
+        return count;
+    }
+    bool ItemRect(long item, automation::Rect& rect) const override
+    {
+        if (item < 0 || item >= ItemCount())
+            return false;
+        const int y = int(item - top) * rowHeight;
+        rect = automation::Rect{0, y, client.right, y + rowHeight};
+        return true;
+    }
+    bool CellRect(long item, int column, automation::Rect& rect) const override
+    {
+        if (!ItemRect(item, rect) || column < 0 || size_t(column) >= columns.size())
+            return false;
+        int left = 0;
+        for (int i = 0; i < column; ++i)
+            left += columns[size_t(i)].width;
+        rect.left = left;
+        rect.right = left + columns[size_t(column)].width;
+        return true;
+    }
+    const automation::AutomationSource* Header() const override { return header; }
+    std::optional<int> HeaderHeight() const override { return headerHeight; }
+    int ColumnCount() const override { return static_cast<int>(columns.size()); }
+    bool Column(int column, automation::ColumnInfo& info) const override
+    {
+        if (column < 0 || size_t(column) >= columns.size())
+            return false;
+        info = columns[size_t(column)];
+        return true;
+    }
+    int ScrolledLeft() const override { return scrolledLeft; }
+    int ItemHeight(long) const override { return itemHeight; }
+    bool IsDroppedDown() const override { return dropped; }
+    const automation::AutomationSource* Popup() const override { return popup; }
+    automation::Rect ClientRect() const override { return client; }
+};
+
+// Memory that holds only what a test says it holds.
+inline automation::MemoryRegion Region(const void* begin, size_t size, bool writable = true)
+{
+    automation::MemoryRegion region;
+    region.begin = reinterpret_cast<std::uintptr_t>(begin);
+    region.end = region.begin + size;
+    region.readable = true;
+    region.writable = writable;
+    return region;
+}
+
+} // namespace automationtest

@@ -1,0 +1,89 @@
+// Reading the process's memory map and checking pointers against it.
+#include "FakeAutomationSource.h"
+
+#include "platform/automation/AutomationText.h"
+#include "platform/automation/MemoryRegions.h"
+
+#include <gtest/gtest.h>
+
+using namespace automation;
+
+namespace
+{
+
+TEST(MemoryMap, ReadsRangesAndAccessAndSkipsWhatIsNoRegion)
+{
+    const std::vector<MemoryRegion> regions = ParseMemoryMap(
+        "55d0c0a00000-55d0c0a21000 rw-p 00000000 00:00 0                          [heap]\n"
+        "7f00aa000000-7f00aa001000 ---p 00000000 00:00 0\n"
+        "7f00ab000000-7f00ab002000 r-xp 00001000 08:01 1234                       /usr/lib/libc.so.6\n"
+        "7f00ac000000-7f00ac001000 rw-s 00000000 00:05 99                         /dev/shm/x (deleted)\n"
+        "not a line\n"
+        "10-8 rw-p 0 0 0\n"
+        "ffffffffffffffffff-0 rw-p\n"
+        "20-30 rwzp 0 0 0\n"
+        "40-50 r--p");
+    ASSERT_EQ(regions.size(), 5u);
+    EXPECT_EQ(regions[0].begin, 0x55d0c0a00000u);
+    EXPECT_EQ(regions[0].end, 0x55d0c0a21000u);
+    EXPECT_TRUE(regions[0].readable && regions[0].writable && !regions[0].executable);
+    EXPECT_FALSE(regions[1].readable || regions[1].writable || regions[1].executable);
+    EXPECT_TRUE(regions[2].readable && !regions[2].writable && regions[2].executable);
+    EXPECT_TRUE(regions[3].writable);
+    EXPECT_EQ(regions[4].begin, 0x40u);
+}
+
+TEST(PointerCheck, AStructureMustLieWhollyInOneAccessibleRegion)
+{
+    MemoryRegion noAccess{0x1000, 0x2000, false, false, false, false};
+    MemoryRegion guard{0x2000, 0x3000, true, true, false, true};
+    MemoryRegion readOnly{0x3000, 0x4000, true, false, false, false};
+    MemoryRegion writable{0x5000, 0x6000, true, true, false, false};
+    MemoryRegion writableToo{0x6000, 0x7000, true, true, false, false};
+    const RegionList memory({writableToo, noAccess, guard, readOnly, writable});
+    const struct
+    {
+        std::uintptr_t address;
+        size_t size;
+        bool readable;
+        bool writable;
+    } cases[] = {
+        {0x1800, 4, false, false},        {0x2800, 4, false, false}, {0x3000, 4, true, false},
+        {0x3ffc, 4, true, false},         {0x3ffd, 4, false, false}, {0x4800, 1, false, false},
+        {0x5000, 8, true, true},          {0x5ffc, 8, true, true}, // neighbours with the same access are one
+                                                                   // region
+        {0x6ff8, 9, false, false},        {0, 1, false, false},      {0x5000, 0, false, false},
+        {0x5000, SIZE_MAX, false, false},
+    };
+    for (const auto& c : cases)
+    {
+        EXPECT_EQ(IsReadable(memory, c.address, c.size), c.readable)
+            << std::hex << c.address << "+" << c.size;
+        EXPECT_EQ(IsWritable(memory, c.address, c.size), c.writable)
+            << std::hex << c.address << "+" << c.size;
+    }
+}
+
+const char kConstantText[] = "held in read-only memory";
+
+TEST(PointerCheck, TheProcessOwnMapKnowsItsStackAndItsConstants)
+{
+    ProcessMemory memory;
+    int onStack = 0;
+    EXPECT_TRUE(IsWritable(memory, reinterpret_cast<std::uintptr_t>(&onStack), sizeof onStack));
+    EXPECT_TRUE(IsReadable(memory, reinterpret_cast<std::uintptr_t>(kConstantText), sizeof kConstantText));
+    EXPECT_FALSE(IsWritable(memory, reinterpret_cast<std::uintptr_t>(kConstantText), sizeof kConstantText));
+    EXPECT_FALSE(IsReadable(memory, 16, 4));
+}
+
+TEST(AutomationText, ConvertsBetweenWideUtf16AndUtf8)
+{
+    EXPECT_EQ(ToUtf16(L"A\u00e9\u20ac\U0001F600"), u"A\u00e9\u20ac\U0001F600");
+    EXPECT_EQ(ToUtf8(u"A\u00e9\u20ac\U0001F600"), "A\xc3\xa9\xe2\x82\xac\xf0\x9f\x98\x80");
+    EXPECT_EQ(ToUtf8(std::u16string(1, char16_t(0xD800))), "\xef\xbf\xbd");
+    EXPECT_TRUE(EqualIgnoringCase(u"\u0141\u00d3D\u0179 \u0416", u"\u0142\u00f3d\u017a \u0436"));
+    EXPECT_FALSE(EqualIgnoringCase(u"\u00d7", u"\u00f7"));
+    EXPECT_FALSE(EqualIgnoringCase(u"ab", u"abc"));
+}
+
+} // namespace
