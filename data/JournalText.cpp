@@ -1,5 +1,6 @@
 #include "data/JournalText.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <cstring>
 
@@ -65,14 +66,6 @@ std::wstring DecodeWideLeniently(const unsigned char* data, std::size_t size, wx
     return text;
 }
 
-std::wstring DecodeSingleByte(const char* bytes, std::size_t size)
-{
-    std::wstring text(size, L'\0');
-    for (std::size_t at = 0; at < size; ++at)
-        text[at] = static_cast<wchar_t>(static_cast<unsigned char>(bytes[at]));
-    return text;
-}
-
 // The library's automatic conversion straight into one buffer: journals of
 // 100000 lines make every extra copy of the whole text count.
 bool DecodeAutomatically(const char* bytes, std::size_t size, std::wstring& text)
@@ -85,15 +78,17 @@ bool DecodeAutomatically(const char* bytes, std::size_t size, std::wstring& text
     return length == 0 || automatic.ToWChar(&text[0], length, bytes, size) == length;
 }
 
-// Decodes the whole file to one text; exact is cleared when bytes were lost.
-std::wstring DecodeText(const char* bytes, std::size_t size, bool& exact)
+bool IsWideMark(wxBOM bom)
+{
+    return bom == wxBOM_UTF16BE || bom == wxBOM_UTF16LE || bom == wxBOM_UTF32BE || bom == wxBOM_UTF32LE;
+}
+
+// A UTF-16 or UTF-32 file decoded whole; exact is cleared when bytes were lost.
+std::wstring DecodeWideText(const char* bytes, std::size_t size, wxBOM bom, bool& exact)
 {
     exact = true;
-    if (size == 0)
-        return std::wstring();
-
-    const wxBOM bom = wxConvAuto::DetectBOM(bytes, size);
-    if (size == BomLength(bom))
+    const std::size_t skip = BomLength(bom);
+    if (size == skip)
         return std::wstring();
     std::wstring text;
     if (DecodeAutomatically(bytes, size, text) && !text.empty())
@@ -107,23 +102,8 @@ std::wstring DecodeText(const char* bytes, std::size_t size, bool& exact)
             }
         return text;
     }
-
-    const std::size_t skip = BomLength(bom);
-    switch (bom)
-    {
-    case wxBOM_UTF16BE:
-    case wxBOM_UTF16LE:
-    case wxBOM_UTF32BE:
-    case wxBOM_UTF32LE:
-        exact = false;
-        return DecodeWideLeniently(reinterpret_cast<const unsigned char*>(bytes) + skip, size - skip, bom);
-    case wxBOM_UTF8:
-        exact = false;
-        return DecodeSingleByte(bytes + skip, size - skip);
-    default:
-        // Too short to tell a mark from text ("\xFF" alone): the fallback.
-        return DecodeSingleByte(bytes, size);
-    }
+    exact = false;
+    return DecodeWideLeniently(reinterpret_cast<const unsigned char*>(bytes) + skip, size - skip, bom);
 }
 
 void AppendUtf8(std::string& out, wxUint32 code)
@@ -178,11 +158,50 @@ std::size_t CountLineBreaks(const std::wstring& text)
     return breaks;
 }
 
-// Calls add(text, length, end) for each line of the decoded text.
-template <typename Add> void SplitLines(const std::wstring& text, Add add)
+// One line as the splitters hand it on.
+struct LinePiece
+{
+    const wchar_t* text;
+    std::size_t length;
+    LineEnd end;
+    // The stored bytes, when the line was read by the single-byte fallback.
+    const char* undecoded = nullptr;
+    std::size_t undecodedLength = 0;
+};
+
+// Counts lines against what one read may hold.
+class LineBudget
+{
+public:
+    bool Take(std::size_t length)
+    {
+        ++m_lines;
+        return m_lines <= kMaxJournalLines && length <= kMaxJournalLineLength;
+    }
+
+private:
+    std::size_t m_lines = 0;
+};
+
+std::size_t ReserveFor(std::size_t lineBreaks)
+{
+    return std::min(lineBreaks + 1, kMaxJournalLines);
+}
+
+// Calls add(piece) for each line of the decoded text; false, part way, when
+// the journal is more than one read may hold.
+template <typename Add> bool SplitLines(const std::wstring& text, Add add)
 {
     const wchar_t* const data = text.data();
     const std::size_t length = text.length();
+    LineBudget budget;
+    auto addLine = [&](std::size_t start, std::size_t lineLength, LineEnd end)
+    {
+        if (!budget.Take(lineLength))
+            return false;
+        add(LinePiece{data + start, lineLength, end});
+        return true;
+    };
 
     // A second mark after the first (a mark written twice) is no text: kept,
     // it would turn into the mark of the UTF-8 rewrite and vanish only then.
@@ -201,11 +220,11 @@ template <typename Add> void SplitLines(const std::wstring& text, Add add)
             end = LineEnd::CrLf;
             ++at;
         }
-        add(data + start, lineLength, end);
+        if (!addLine(start, lineLength, end))
+            return false;
         start = at + 1;
     }
-    if (start < length)
-        add(data + start, length - start, LineEnd::None);
+    return start >= length || addLine(start, length - start, LineEnd::None);
 }
 
 // Strict UTF-8 as Unicode defines it: no overlong forms, no surrogates,
@@ -319,10 +338,18 @@ std::size_t CountLineFeeds(const char* at, const char* end)
     return feeds;
 }
 
-// Calls add(text, length, end) for each line of a UTF-8 journal, decoding line
-// by line: the whole file is never held as wide text, which for journals of a
-// hundred thousand lines would double the memory a read touches. False, with
-// nothing added, when the bytes are not (all) UTF-8.
+// The single-byte fallback: each byte is the character of that number.
+void DecodeSingleBytes(const unsigned char* at, const unsigned char* end, wchar_t* out)
+{
+    while (at < end)
+        *out++ = *at++;
+}
+
+// Calls add(piece) for each line of a UTF-8 journal, decoding line by line: a
+// line that is no UTF-8 goes to the fallback alone, and the whole file is never
+// held as wide text, which for journals of a hundred thousand lines would
+// double the memory a read touches. False, part way, when the journal is more
+// than one read may hold.
 template <typename Add> bool SplitUtf8Lines(const char* bytes, std::size_t size, Add add)
 {
     const auto* at = reinterpret_cast<const unsigned char*>(bytes);
@@ -331,16 +358,27 @@ template <typename Add> bool SplitUtf8Lines(const char* bytes, std::size_t size,
     static constexpr unsigned char kMark[] = {0xEF, 0xBB, 0xBF};
     while (end - at >= 3 && std::memcmp(at, kMark, 3) == 0)
         at += 3;
-    if (!IsValidUtf8(at, end))
-        return false;
+    // Nearly every journal is UTF-8 throughout: one check of the whole spares
+    // a check of each line.
+    const bool allValid = IsValidUtf8(at, end);
 
+    LineBudget budget;
     std::wstring line;
     auto addLine = [&](const unsigned char* start, const unsigned char* lineEnd, LineEnd ending)
     {
         const std::size_t byteLength = static_cast<std::size_t>(lineEnd - start);
+        if (!budget.Take(byteLength))
+            return false;
         if (line.size() < byteLength)
             line.resize(byteLength);
-        add(line.data(), DecodeValidUtf8(start, lineEnd, &line[0]), ending);
+        if (allValid || IsValidUtf8(start, lineEnd))
+        {
+            add(LinePiece{line.data(), DecodeValidUtf8(start, lineEnd, &line[0]), ending});
+            return true;
+        }
+        DecodeSingleBytes(start, lineEnd, &line[0]);
+        add(LinePiece{line.data(), byteLength, ending, reinterpret_cast<const char*>(start), byteLength});
+        return true;
     };
     // The next LF, then the first CR before it: each a vectorised scan. The LF
     // found is kept while lines end in a lone CR, so a file of CR-ended lines
@@ -358,43 +396,65 @@ template <typename Add> bool SplitUtf8Lines(const char* bytes, std::size_t size,
         const unsigned char* const stop = feed != nullptr ? feed : end;
         const auto* carriage =
             static_cast<const unsigned char*>(std::memchr(at, '\r', static_cast<std::size_t>(stop - at)));
+        bool taken;
         if (carriage != nullptr)
         {
             const bool pair = carriage + 1 == feed;
-            addLine(at, carriage, pair ? LineEnd::CrLf : LineEnd::Cr);
+            taken = addLine(at, carriage, pair ? LineEnd::CrLf : LineEnd::Cr);
             at = carriage + (pair ? 2 : 1);
         }
         else if (feed != nullptr)
         {
-            addLine(at, feed, LineEnd::Lf);
+            taken = addLine(at, feed, LineEnd::Lf);
             at = feed + 1;
         }
         else
         {
-            addLine(at, end, LineEnd::None);
+            taken = addLine(at, end, LineEnd::None);
             at = end;
         }
+        if (!taken)
+            return false;
     }
     return true;
 }
 
-// Plain UTF-8 (with or without its mark) is read line by line; every other
-// form is decoded whole and split afterwards.
-template <typename Reserve, typename Add>
-bool SplitJournal(const char* bytes, std::size_t size, Reserve reserve, Add add)
+enum class Decoding
 {
-    bool exact = true;
+    Exact,
+    Lossy,   // characters were replaced
+    TooLarge // stopped part way
+};
+
+// UTF-8 (with or without its mark, or too short to tell) is read line by line;
+// UTF-16 and UTF-32 are decoded whole and split afterwards.
+template <typename Reserve, typename Add>
+Decoding SplitJournal(const char* bytes, std::size_t size, Reserve reserve, Add add)
+{
     const wxBOM bom = size == 0 ? wxBOM_None : wxConvAuto::DetectBOM(bytes, size);
-    if (bom == wxBOM_None || bom == wxBOM_UTF8)
+    if (!IsWideMark(bom))
     {
-        reserve(CountLineFeeds(bytes, bytes + size) + 1);
-        if (SplitUtf8Lines(bytes, size, add))
-            return true;
+        reserve(ReserveFor(CountLineFeeds(bytes, bytes + size)));
+        return SplitUtf8Lines(bytes, size, add) ? Decoding::Exact : Decoding::TooLarge;
     }
-    const std::wstring text = DecodeText(bytes, size, exact);
-    reserve(CountLineBreaks(text) + 1);
-    SplitLines(text, add);
-    return exact;
+    bool exact = true;
+    const std::wstring text = DecodeWideText(bytes, size, bom, exact);
+    reserve(ReserveFor(CountLineBreaks(text)));
+    if (!SplitLines(text, add))
+        return Decoding::TooLarge;
+    return exact ? Decoding::Exact : Decoding::Lossy;
+}
+
+// Whether the text is still what the fallback read from these bytes.
+bool IsFallbackReadOf(const wxString& text, const std::string& bytes)
+{
+    if (bytes.empty() || text.length() != bytes.size())
+        return false;
+    const wchar_t* const data = text.wc_str();
+    for (std::size_t at = 0; at < bytes.size(); ++at)
+        if (static_cast<wxUint32>(data[at]) != static_cast<unsigned char>(bytes[at]))
+            return false;
+    return true;
 }
 
 } // namespace
@@ -402,29 +462,42 @@ bool SplitJournal(const char* bytes, std::size_t size, Reserve reserve, Add add)
 DecodedJournal DecodeJournal(const char* bytes, std::size_t size)
 {
     DecodedJournal journal;
-    journal.exact = SplitJournal(
+    const Decoding decoding = SplitJournal(
         bytes, size, [&journal](std::size_t count) { journal.lines.reserve(count); },
-        [&journal](const wchar_t* line, std::size_t length, LineEnd end)
+        [&journal](const LinePiece& piece)
         {
             // Built in place: wxString has no move, so a pushed temporary is copied.
             journal.lines.emplace_back();
-            journal.lines.back().text.assign(line, length);
-            journal.lines.back().end = end;
+            JournalLine& line = journal.lines.back();
+            line.text.assign(piece.text, piece.length);
+            line.end = piece.end;
+            if (piece.undecoded != nullptr)
+                line.undecoded.assign(piece.undecoded, piece.undecodedLength);
         });
+    journal.exact = decoding == Decoding::Exact;
+    if (decoding == Decoding::TooLarge)
+    {
+        journal.tooLarge = true;
+        journal.lines = std::vector<JournalLine>();
+    }
     return journal;
 }
 
-void DecodeJournalTexts(const char* bytes, std::size_t size, wxArrayString& lines)
+bool DecodeJournalTexts(const char* bytes, std::size_t size, wxArrayString& lines)
 {
-    lines.Clear();
-    SplitJournal(
-        bytes, size, [&lines](std::size_t count) { lines.Alloc(count); },
-        [&lines](const wchar_t* line, std::size_t length, LineEnd)
+    wxArrayString decoded;
+    const Decoding decoding = SplitJournal(
+        bytes, size, [&decoded](std::size_t count) { decoded.Alloc(count); },
+        [&decoded](const LinePiece& piece)
         {
             static const wxString empty;
-            lines.Add(empty);
-            lines.Last().assign(line, length);
+            decoded.Add(empty);
+            decoded.Last().assign(piece.text, piece.length);
         });
+    if (decoding == Decoding::TooLarge)
+        return false;
+    lines.swap(decoded);
+    return true;
 }
 
 std::string EncodeJournal(const std::vector<JournalLine>& lines)
@@ -432,9 +505,16 @@ std::string EncodeJournal(const std::vector<JournalLine>& lines)
     std::string out;
     for (const JournalLine& line : lines)
     {
-        const wchar_t* const data = line.text.wc_str();
-        for (std::size_t at = 0, length = line.text.length(); at < length; ++at)
-            AppendUtf8(out, static_cast<wxUint32>(data[at]));
+        if (IsFallbackReadOf(line.text, line.undecoded))
+        {
+            out += line.undecoded;
+        }
+        else
+        {
+            const wchar_t* const data = line.text.wc_str();
+            for (std::size_t at = 0, length = line.text.length(); at < length; ++at)
+                AppendUtf8(out, static_cast<wxUint32>(data[at]));
+        }
         out += LineEndBytes(line.end);
     }
     return out;

@@ -148,15 +148,14 @@ INSTANTIATE_TEST_SUITE_P(
     ::testing::Values(
         BytesCase{"Utf8WithoutMark", "1\tcaf\xC3\xA9\r\n", {"1\tcaf\xC3\xA9"}, true},
         BytesCase{"Latin1Fallback", "1\tcaf\xE9\tM\xFCnchen\r\n", {"1\tcaf\xC3\xA9\tM\xC3\xBCnchen"}, true},
-        // One invalid sequence sends the whole file to the single-byte fallback.
-        BytesCase{"InvalidUtf8", "1\t\xC3\xA9\r\n2\t\xFF\r\n", {"1\t\xC3\x83\xC2\xA9", "2\t\xC3\xBF"}, true},
+        // An invalid sequence sends its own line to the single-byte fallback, no other.
+        BytesCase{"InvalidUtf8", "1\t\xC3\xA9\r\n2\t\xFF\r\n", {"1\t\xC3\xA9", "2\t\xC3\xBF"}, true},
         BytesCase{"TruncatedUtf8Sequence", "1\tab\xE2\x82", {"1\tab\xC3\xA2\xC2\x82"}, true},
-        // An overlong "/" is no UTF-8: the file falls back to single bytes. Encoded
-        // surrogates and values beyond U+10FFFF are no characters: they read as
-        // U+FFFD, and a rewrite, which would lose them, is refused.
+        // An overlong "/", an encoded surrogate and a value beyond U+10FFFF are no
+        // UTF-8: their lines fall back to single bytes, which a rewrite keeps.
         BytesCase{"OverlongUtf8", "1\t\xC0\xAF\r\n", {"1\t\xC3\x80\xC2\xAF"}, true},
-        BytesCase{"Utf8Surrogate", "\xED\xA0\x80", {"\xEF\xBF\xBD"}, false},
-        BytesCase{"Utf8BeyondUnicode", "\xF4\x90\x80\x80", {"\xEF\xBF\xBD"}, false},
+        BytesCase{"Utf8Surrogate", "\xED\xA0\x80", {"\xC3\xAD\xC2\xA0\xC2\x80"}, true},
+        BytesCase{"Utf8BeyondUnicode", "\xF4\x90\x80\x80", {"\xC3\xB4\xC2\x90\xC2\x80\xC2\x80"}, true},
         // Long runs of ASCII are taken eight bytes at a time; what follows them must still decode.
         BytesCase{"Utf8AfterLongAscii",
                   "0123456789abcdef\xF0\x9F\x96\xA8\tKl\xC3\xB6ln 012345678\xE2\x82\xAC\r\nx",
@@ -192,7 +191,7 @@ INSTANTIATE_TEST_SUITE_P(
                   "\xEF\xBB\xBF"
                   "1\t\xFF\r\n",
                   {"1\t\xC3\xBF"},
-                  false}),
+                  true}),
     [](const ::testing::TestParamInfo<BytesCase>& info) { return std::string(info.param.name); });
 
 // --- line splitting ------------------------------------------------------------------------
