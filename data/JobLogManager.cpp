@@ -2,7 +2,8 @@
 
 #include <algorithm>
 #include <chrono>
-#include <condition_variable>
+#include <ctime>
+#include <typeinfo>
 #include <locale>
 #include <stdexcept>
 #include <thread>
@@ -33,6 +34,8 @@ constexpr int kLogChannel = 1;
 
 // A producer that keeps the journal locked longer than this makes a clear fail.
 constexpr std::chrono::milliseconds kClearLockLimit{3000};
+// Short enough to find the gaps between a busy producer's appends.
+constexpr std::chrono::milliseconds kClearLockAttemptPause{5};
 
 const std::locale& KeyFoldingLocale()
 {
@@ -129,64 +132,23 @@ bool PieceIsNoCase(const wchar_t* line, const PieceSpan& piece, const std::wstri
 const std::wstring kSucceeded = L"Transferred Successfully";
 const std::wstring kAdded = L"ADDED";
 
-// Holds a journal's lock, waited for at most a limit. The wait blocks, so the
-// kernel queues it and a producer appending without pause cannot starve it as
-// it would a poll; it runs on a helper thread that the caller walks away from
-// at the limit, and that then lets go of the lock as soon as it gets it.
+// Tries the journal's lock until it is free or the limit has passed. Clear
+// All runs on a worker thread, so the window stays responsive meanwhile; the
+// attempts never block, so nothing is left waiting for the lock afterwards.
 class BoundedJournalLock
 {
 public:
-    BoundedJournalLock(const wxString& name, std::chrono::milliseconds limit)
-        : m_shared(std::make_shared<Shared>(name))
+    BoundedJournalLock(const wxString& name, std::chrono::milliseconds limit) : m_lock(name)
     {
-        if (m_shared->lock.try_lock())
-        {
-            m_locked = true;
-            return;
-        }
-        std::thread(
-            [shared = m_shared]
-            {
-                const bool locked = shared->lock.lock();
-                std::lock_guard<std::mutex> guard(shared->mutex);
-                shared->finished = true;
-                shared->locked = locked;
-                if (shared->abandoned)
-                    shared->lock.unlock();
-                shared->done.notify_one();
-            })
-            .detach();
-        std::unique_lock<std::mutex> guard(m_shared->mutex);
-        if (m_shared->done.wait_for(guard, limit, [this] { return m_shared->finished; }))
-            m_locked = m_shared->locked;
-        else
-            m_shared->abandoned = true;
-    }
-    ~BoundedJournalLock()
-    {
-        if (m_locked)
-            m_shared->lock.unlock();
+        const auto until = std::chrono::steady_clock::now() + limit;
+        while (m_lock.usable() && !(m_locked = m_lock.try_lock()) && std::chrono::steady_clock::now() < until)
+            std::this_thread::sleep_for(kClearLockAttemptPause);
     }
 
     bool IsLocked() const { return m_locked; }
 
 private:
-    BoundedJournalLock(const BoundedJournalLock&) = delete;
-    BoundedJournalLock& operator=(const BoundedJournalLock&) = delete;
-
-    struct Shared
-    {
-        explicit Shared(const wxString& name) : lock(name) {}
-
-        std::mutex mutex;
-        std::condition_variable done;
-        bool finished = false;
-        bool abandoned = false;
-        bool locked = false;
-        named_mutex_lock lock;
-    };
-
-    std::shared_ptr<Shared> m_shared;
+    named_mutex_lock m_lock;
     bool m_locked = false;
 };
 
@@ -230,20 +192,10 @@ JobLogManager& JobLogManager::GetInstance()
 }
 
 JobLogManager::JobLogManager(const wxString& journalPath, std::unique_ptr<wyx::IJobReadWriter> reader)
-    : m_journalPath(journalPath), m_lockName(wxFileName(journalPath).GetName()), m_reader(std::move(reader)),
-      m_iconRefreshSetting(&ReadIconRefreshSetting)
+    : m_journalPath(journalPath),
+      m_reader(reader ? std::move(reader) : MakeJournalFileReader(journalPath, m_running)),
+      m_iconRefreshSetting(&ReadIconRefreshSetting), m_journal(journalPath, m_reader.get())
 {
-    if (!m_reader)
-    {
-        auto fileReader = std::unique_ptr<wyx::IJobReadWriter>(CreateJobReadWriter(kJobsFileReadWriterKind));
-        if (auto* journal = dynamic_cast<wyx::JobsFileReadWriter*>(fileReader.get()))
-        {
-            journal->SetPath(m_journalPath);
-            // A read waiting for the producer gives up when the program stops.
-            journal->SetKeepWaiting(&m_running);
-        }
-        m_reader = std::move(fileReader);
-    }
 }
 
 JobLogManager::~JobLogManager() = default;
@@ -260,11 +212,13 @@ void JobLogManager::SetIconRefreshSettingSource(std::function<wxString()> source
 
 int JobLogManager::Refresh()
 {
-    if (Parse() != 1)
+    const int parsed = Parse();
+    // A journal that turned busy or unreadable is news too: the view says so.
+    if (!m_journal.TakeReportNews() && parsed != 1)
         return 0;
     wxCommandEvent update(wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBLOG, 0);
     EventBus::Get().Publish(ChannelKey(kLogChannel), update);
-    return 1;
+    return parsed;
 }
 
 int JobLogManager::Parse()
@@ -284,45 +238,15 @@ int JobLogManager::Parse()
 
     wxArrayString lines;
     wyxos::FileStamp stamp;
-    if (!ReadChangedJournal(lines, stamp))
+    if (m_journal.Poll(lines, stamp) != ChangedJournal::Outcome::Read)
         return 0;
     std::vector<LineLayout> layouts;
     std::vector<wxString> times;
     LayOutLines(lines, firstRead, layouts, times);
     bool tookIn = false;
     if (TakeIn(lines, layouts, times, clearGeneration, tookIn))
-        m_lastSeen = stamp;
+        m_journal.Accept(stamp);
     return tookIn && m_running.load() ? 1 : 0;
-}
-
-// Reads the journal when it changed since the last read. Its stamp is stored as
-// seen only once the content behind it has been taken in, so a change that the
-// producer's lock kept us from reading is read at a later poll.
-bool JobLogManager::ReadChangedJournal(wxArrayString& lines, wyxos::FileStamp& stamp)
-{
-    if (!wyxos::StatFile(m_journalPath).exists)
-        return false;
-    {
-        named_mutex_lock journalLock(m_lockName);
-        if (!journalLock.try_lock())
-            return false;
-        // Taken under the lock, so no write is half done; taken before reading,
-        // so a write that slips in before ReadJobs is seen again next time.
-        stamp = wyxos::StatFile(m_journalPath);
-        if (!stamp.exists || stamp == m_lastSeen)
-            return false;
-    }
-
-    const int result = m_reader->ReadJobs(lines);
-    if (result == wyx::JobLockFailed)
-        return false;
-    if (result != wyx::JobOk)
-    {
-        // Unreadable: wait for the next change rather than retry every second.
-        m_lastSeen = stamp;
-        return false;
-    }
-    return true;
 }
 
 // Outside the lock: finds the pieces of every line, and on the first read, when
@@ -509,7 +433,7 @@ int JobLogManager::ClearJournalAndRecords()
     // Held across the replacement and the emptying of the list, so that a
     // producer's append lands either before (and is cleared) or after (in the
     // new file), and a poll never takes the old lines in again.
-    const BoundedJournalLock journalLock(m_lockName, kClearLockLimit);
+    const BoundedJournalLock journalLock(m_journal.GetLockName(), kClearLockLimit);
     if (!journalLock.IsLocked() || !ReplaceJournalWithEmptyFile())
         return 1;
     std::lock_guard<std::mutex> guard(m_lock);

@@ -15,6 +15,7 @@
 
 #include "data/JobReadWriter.h"
 #include "data/JobRecord.h"
+#include "data/ChangedJournal.h"
 #include "platform/os/FileStamp.h"
 
 // A log journal line as a record: false unless it has exactly eight
@@ -52,6 +53,8 @@ public:
     virtual ~JobLogManager();
 
     // 1 when records were taken in (and, for Refresh, the log views were told).
+    // Refresh also tells the views, with 0, when the journal turned busy,
+    // unreadable or readable again.
     int Refresh();
     int Parse();
 
@@ -91,6 +94,9 @@ public:
     // See AcknowledgeResult.
     int AcknowledgeFolderErrors(const wxString& hotFolderPath);
 
+    // Whether the latest polls could read the journal, for the view to say so.
+    JournalWatch::Report GetJournalReport() const { return m_journal.GetReport(); }
+
     // False stops a read under way at the next line and makes later reads take nothing.
     void SetRunning(bool running);
 
@@ -100,7 +106,6 @@ public:
 private:
     struct LineLayout;
 
-    bool ReadChangedJournal(wxArrayString& lines, wyxos::FileStamp& stamp);
     void LayOutLines(const wxArrayString& lines, bool formatTimes, std::vector<LineLayout>& layouts,
                      std::vector<wxString>& times) const;
     // False when the list was cleared meanwhile and what was read is dropped.
@@ -110,14 +115,13 @@ private:
     bool ReplaceJournalWithEmptyFile();
 
     const wxString m_journalPath;
-    const wxString m_lockName;
     std::atomic<bool> m_running{true};
     std::unique_ptr<wyx::IJobReadWriter> m_reader;
     std::function<wxString()> m_iconRefreshSetting;
 
     // Polling thread only.
     std::mutex m_parseLock;
-    wyxos::FileStamp m_lastSeen;
+    ChangedJournal m_journal;
 
     mutable std::mutex m_lock;
     // A deque, as wxString has no move: a growing vector would copy every record.

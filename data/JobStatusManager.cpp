@@ -1,13 +1,10 @@
 #include "data/JobStatusManager.h"
 
-#include <ctime>
-
 #include <wx/event.h>
 #include <wx/filename.h>
 
 #include "data/DataLocations.h"
 #include "data/JobReadWriter.h"
-#include "data/NamedMutex.h"
 #include "data/StatusLine.h"
 #include "platform/datasource/WyxDataSource.h"
 #include "pump/CustomEvents.h"
@@ -15,20 +12,7 @@
 
 namespace
 {
-
 constexpr int kStatusChannel = 2;
-
-std::unique_ptr<wyx::IJobReadWriter> MakeFileReader(const wxString& path, const std::atomic<bool>& running)
-{
-    std::unique_ptr<wyx::IJobReadWriter> reader(CreateJobReadWriter(kJobsFileReadWriterKind));
-    if (auto* file = dynamic_cast<wyx::JobsFileReadWriter*>(reader.get()))
-    {
-        file->SetPath(path);
-        file->SetKeepWaiting(&running);
-    }
-    return reader;
-}
-
 } // namespace
 
 JobStatusManager& JobStatusManager::GetInstance()
@@ -38,8 +22,8 @@ JobStatusManager& JobStatusManager::GetInstance()
 }
 
 JobStatusManager::JobStatusManager(const wxString& journalPath, std::unique_ptr<wyx::IJobReadWriter> reader)
-    : m_journalPath(journalPath), m_lockName(wxFileName(journalPath).GetName()),
-      m_reader(reader ? std::move(reader) : MakeFileReader(journalPath, m_running))
+    : m_journalPath(journalPath), m_reader(reader ? std::move(reader) : MakeJournalFileReader(journalPath, m_running)),
+      m_journal(journalPath, m_reader.get())
 {
 }
 
@@ -55,61 +39,13 @@ void JobStatusManager::SetRunning(bool running)
     m_running = running;
 }
 
-JobStatusManager::ReadOutcome JobStatusManager::ReadChangedJournal(wxArrayString& lines,
-                                                                   wyxos::FileStamp& readStamp)
-{
-    // An unchanged stamp needs no lock: an idle poll is one stat.
-    if (!m_reader)
-        return ReadOutcome::Unchanged;
-    const wyxos::FileStamp seenNow = wyxos::StatFile(m_journalPath);
-    if (!seenNow.exists || seenNow == m_lastSeen)
-        return ReadOutcome::Unchanged;
-
-    // The producer holds the lock while it writes: a stamp taken under it is
-    // the stamp of a whole file, and the read happens under the same lock.
-    named_mutex_lock lock(m_lockName);
-    if (!lock.usable())
-        return ReadOutcome::Unreadable;
-    if (!lock.try_lock())
-        return ReadOutcome::Busy;
-    const wyxos::FileStamp stamp = wyxos::StatFile(m_journalPath);
-    if (!stamp.exists || stamp == m_lastSeen)
-        return ReadOutcome::Unchanged;
-
-    int result;
-    if (auto* file = dynamic_cast<wyx::JobsFileReadWriter*>(m_reader.get()))
-    {
-        result = file->ReadJobsHoldingLock(lines);
-    }
-    else
-    {
-        // A reader of another kind takes the lock itself.
-        lock.unlock();
-        result = m_reader->ReadJobs(lines);
-        if (result == wyx::JobLockFailed)
-            return ReadOutcome::Busy;
-    }
-    readStamp = stamp;
-    return result == wyx::JobOk ? ReadOutcome::Read : ReadOutcome::Unreadable;
-}
-
 int JobStatusManager::Parse()
 {
     std::lock_guard<std::mutex> parseGuard(m_parseLock);
     wxArrayString lines;
     wyxos::FileStamp stamp;
-    const ReadOutcome outcome = ReadChangedJournal(lines, stamp);
-    if (outcome == ReadOutcome::Unreadable)
-        m_lastSeen = stamp; // wait for the next change
-    const std::time_t now = std::time(nullptr);
-    if (outcome == ReadOutcome::Busy && m_watch.NoteBusy(now))
-        m_watchChanged = true;
-    else if (outcome == ReadOutcome::Unreadable && m_watch.NoteUnreadable(now))
-        m_watchChanged = true;
-    if (outcome != ReadOutcome::Read)
+    if (m_journal.Poll(lines, stamp) != ChangedJournal::Outcome::Read)
         return 0;
-    if (m_watch.NoteRead(now))
-        m_watchChanged = true;
 
     auto fresh = std::make_shared<JobSnapshot>();
     std::vector<JobRecord>& jobs = fresh->jobs;
@@ -131,7 +67,7 @@ int JobStatusManager::Parse()
 
     // A read cut short by a stop keeps what it has, and is read whole next time.
     if (m_running)
-        m_lastSeen = stamp;
+        m_journal.Accept(stamp);
 
     std::shared_ptr<const JobSnapshot> released;
     {
@@ -150,7 +86,7 @@ int JobStatusManager::Refresh()
 {
     const int parsed = Parse();
     // A journal that turned busy or unreadable is news too: the view says so.
-    if (!m_watchChanged.exchange(false) && parsed != 1)
+    if (!m_journal.TakeReportNews() && parsed != 1)
         return 0;
     wxCommandEvent event(wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS, 0);
     EventBus::Get().Publish(ChannelKey(kStatusChannel), event);

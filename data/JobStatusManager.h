@@ -11,7 +11,7 @@
 
 #include "data/JobReadWriter.h"
 #include "data/JobRecord.h"
-#include "data/JournalWatch.h"
+#include "data/ChangedJournal.h"
 #include "platform/os/FileStamp.h"
 
 // One read of the status journal: the jobs in journal order and, beside them,
@@ -66,31 +66,16 @@ public:
 
     const wxString& GetJournalPath() const { return m_journalPath; }
     // Whether the latest polls could read the journal, for the view to say so.
-    JournalWatch::Report GetJournalReport() const { return m_watch.Get(); }
+    JournalWatch::Report GetJournalReport() const { return m_journal.GetReport(); }
 
 private:
-    enum class ReadOutcome
-    {
-        Unchanged,  // missing or unchanged: look again next time
-        Busy,       // changed, but its lock is held: look again next time
-        Unreadable, // changed but could not be read (or its lock cannot be used): wait for the next change
-        Read
-    };
-
-    // readStamp: the stamp of what was read (or found unreadable).
-    ReadOutcome ReadChangedJournal(wxArrayString& lines, wyxos::FileStamp& readStamp);
-
     const wxString m_journalPath;
-    const wxString m_lockName;
     std::atomic<bool> m_running{true};
     std::unique_ptr<wyx::IJobReadWriter> m_reader;
+    // Polling thread only.
+    ChangedJournal m_journal;
 
-    // Polling thread only. No stamp at first, so an existing journal is read at
-    // the first poll whenever it was written.
     std::mutex m_parseLock;
-    wyxos::FileStamp m_lastSeen;
-    // The journal's report changed since the views were last told.
-    std::atomic<bool> m_watchChanged{false};
 
     mutable std::mutex m_lock;
     std::shared_ptr<const JobSnapshot> m_snapshot = std::make_shared<JobSnapshot>();
@@ -98,5 +83,4 @@ private:
     // of it, so the polling thread frees it, not the GUI thread.
     std::shared_ptr<const JobSnapshot> m_previous;
     std::atomic<std::uint64_t> m_generation{0};
-    JournalWatch m_watch;
 };

@@ -281,12 +281,15 @@ void JobLogView::OnSize(wxSizeEvent& event)
 void JobLogView::OnUpdateJobLog(wxCommandEvent&)
 {
     std::vector<JobRecord> records;
-    // A second queued update finds nothing: the first took it all.
-    if (model.GetRecordsSince(cursor, records) == 0)
-        return;
-    // The list repaints only the rows it gains; the rest of the tab stays.
-    AppendRows(records);
-    ShowErrorPanel(false);
+    // A second queued update finds nothing: the first took it all. An update
+    // may also only say that the journal turned busy, unreadable or readable.
+    if (model.GetRecordsSince(cursor, records) != 0)
+    {
+        // The list repaints only the rows it gains; the rest of the tab stays,
+        // the detail of a selected failed job included: on a busy service jobs
+        // finish every few seconds, and the user is still reading it.
+        AppendRows(records);
+    }
     UpdateFooterWithSelection();
 }
 
@@ -454,18 +457,24 @@ void JobLogView::ShowErrorPanel(bool show)
 
 void JobLogView::UpdateFooter()
 {
-    statusBar->SetStatusText(viewrules::CountFooter(logList->GetItemCount()), 0);
+    ShowFooter(viewrules::CountFooter(logList->GetItemCount()));
 }
 
 void JobLogView::UpdateFooterWithSelection()
 {
     const long count = logList->GetItemCount();
     const long selected = logList->GetSelectedItemCount();
-    const wxString text =
-        selected >= 1
-            ? viewrules::SelectionFooter(_("[WYX3Value1] of [WYX3Value2] items selected."), selected, count)
-            : wxString::Format(wxS("%ld "), count) + _("Items");
-    statusBar->SetStatusText(text, 0);
+    ShowFooter(selected >= 1 ? viewrules::SelectionFooter(_("[WYX3Value1] of [WYX3Value2] items selected."),
+                                                          selected, count)
+                             : wxString::Format(wxS("%ld "), count) + _("Items"));
+}
+
+void JobLogView::ShowFooter(const wxString& counts)
+{
+    const wxString notice = viewrules::JournalNotice(
+        model.GetJournalReport(),
+        {_("Log journal busy since %s"), _("Log journal cannot be read"), _("Log journal readable again since %s")});
+    statusBar->SetStatusText(counts + (notice.empty() ? wxString() : wxS(" - ") + notice), 0);
 }
 
 // clang-format off

@@ -89,6 +89,8 @@ private:
     void ShowErrorPanel(bool show);
     void UpdateFooter();
     void UpdateFooterWithSelection();
+    // The counts, and what the journal's latest polls came to when that is news.
+    void ShowFooter(const wxString& counts);
 
     JobLogManager& model;
     std::unique_ptr<wxImageList> rowImages;

@@ -30,8 +30,10 @@ struct ColumnSpec
     const char* heading;
     int width;
 };
-constexpr ColumnSpec kColumns[] = {{"No.", 40},     {"File Name", 120}, {"Format", 65}, {"Hot Folder", 120},
-                                   {"Server", 130}, {"Size", 65},       {"Time", 100},  {"Status", 145}};
+constexpr ColumnSpec kColumns[] = {{wxTRANSLATE("No."), 40},     {wxTRANSLATE("File Name"), 120},
+                                   {wxTRANSLATE("Format"), 65},  {wxTRANSLATE("Hot Folder"), 120},
+                                   {wxTRANSLATE("Server"), 130}, {wxTRANSLATE("Size"), 65},
+                                   {wxTRANSLATE("Time"), 100},   {wxTRANSLATE("Status"), 145}};
 
 const Theme& ThemeOf(const char* name)
 {
@@ -142,9 +144,9 @@ void JobStatusView::OnSize(wxSizeEvent& event)
 void JobStatusView::OnUpdateJobStatus(wxCommandEvent&)
 {
     wxCriticalSectionLocker guard(lock);
-    if (shownOnce && model.GetGeneration() == shownGeneration)
-        return;
-    RefreshFromModel();
+    // Nothing new to list: the journal only turned busy, unreadable or readable again.
+    if (!shownOnce || model.GetGeneration() != shownGeneration)
+        RefreshFromModel();
     UpdateFooter();
 }
 
@@ -295,5 +297,9 @@ void JobStatusView::OnTimer(wxTimerEvent&)
 void JobStatusView::UpdateFooter()
 {
     wxCriticalSectionLocker guard(lock);
-    statusBar->SetStatusText(viewrules::CountFooter(jobList->GetItemCount()), 0);
+    const wxString notice = viewrules::JournalNotice(
+        model.GetJournalReport(), {_("Status journal busy since %s"), _("Status journal cannot be read"),
+                                   _("Status journal readable again since %s")});
+    statusBar->SetStatusText(
+        viewrules::CountFooter(jobList->GetItemCount()) + (notice.empty() ? wxString() : wxS(" - ") + notice), 0);
 }

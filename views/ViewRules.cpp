@@ -2,6 +2,7 @@
 
 #include "data/StatusLine.h"
 
+#include <wx/datetime.h>
 #include <wx/intl.h>
 
 #include <algorithm>
@@ -54,15 +55,15 @@ wxString FormatSize(const wxString& bytes)
     if (end == narrow.c_str() || !std::isfinite(value))
         value = 0;
     value /= 1024;
-    const char* unit = "KB";
+    const char* unit = wxTRANSLATE("KB");
     if (value > 1024)
     {
         value /= 1024;
-        unit = "MB";
+        unit = wxTRANSLATE("MB");
         if (value > 1024)
         {
             value /= 1024;
-            unit = "GB";
+            unit = wxTRANSLATE("GB");
         }
     }
     return wxString::Format(wxS("%0.2f"), value) + wxGetTranslation(unit);
@@ -106,6 +107,21 @@ wxString SelectionFooter(const wxString& templateText, long selected, long count
     text.Replace(wxS("[WYX3Value1]"), wxString::Format(wxS("%ld"), selected), false);
     text.Replace(wxS("[WYX3Value2]"), wxString::Format(wxS("%ld"), count), false);
     return text;
+}
+
+wxString JournalNotice(const JournalWatch::Report& report, const JournalNoticeTexts& texts)
+{
+    const wxString time = wxDateTime(static_cast<time_t>(report.since)).Format(wxS("%H:%M"));
+    switch (report.state)
+    {
+    case JournalWatch::State::Busy:
+        return wxString::Format(texts.busySince, time);
+    case JournalWatch::State::Unreadable:
+        return texts.unreadable;
+    case JournalWatch::State::Readable:
+        break;
+    }
+    return report.recovered ? wxString::Format(texts.readableAgainSince, time) : wxString();
 }
 
 std::uint64_t SortNumber(const wxString& text)

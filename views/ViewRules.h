@@ -1,6 +1,7 @@
 #pragma once
 
 #include "data/JobRecord.h"
+#include "data/JournalWatch.h"
 
 #include <wx/arrstr.h>
 #include <wx/string.h>
@@ -42,6 +43,17 @@ wxString CountFooter(long count);
 // selected count, the first "[WYX3Value2]" the row count, in whatever order
 // a translation puts them.
 wxString SelectionFooter(const wxString& templateText, long selected, long count);
+
+// What a footer adds when its journal could not be read at the latest polls,
+// or has just become readable again: empty while all is well. The texts hold
+// one "%s" for the time.
+struct JournalNoticeTexts
+{
+    wxString busySince;
+    wxString unreadable;
+    wxString readableAgainSince;
+};
+wxString JournalNotice(const JournalWatch::Report& report, const JournalNoticeTexts& texts);
 
 // How a sort column compares: its text ignoring case, or its text read as an
 // unsigned decimal number (0 when it does not read as one).

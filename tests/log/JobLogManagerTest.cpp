@@ -273,6 +273,25 @@ TEST_F(LogModel, ChangeMadeWhileTheProducerHoldsTheLockIsReadLater)
     EXPECT_EQ(1u, m_model.GetRecordCount());
 }
 
+TEST_F(LogModel, AnIdlePollLeavesTheLockAloneAndAHeldLockMakesAChangedJournalBusy)
+{
+    Write(LogLine("1", "ADDED"));
+    ASSERT_EQ(1, m_model.Refresh());
+    named_mutex_lock producer("TiveraJobsLogFile");
+    ASSERT_TRUE(producer.try_lock());
+    for (int poll = 0; poll < 2 * JournalWatch::kBusyPolls; ++poll)
+        EXPECT_EQ(0, m_model.Refresh());
+    EXPECT_EQ(JournalWatch::State::Readable, m_model.GetJournalReport().state) << "unchanged: lock never tried";
+
+    Append(LogLine("2", "ADDED"));
+    for (int poll = 0; poll < JournalWatch::kBusyPolls; ++poll)
+        EXPECT_EQ(0, m_model.Refresh());
+    EXPECT_EQ(JournalWatch::State::Busy, m_model.GetJournalReport().state);
+    producer.unlock();
+    EXPECT_EQ(1, m_model.Refresh());
+    EXPECT_TRUE(m_model.GetJournalReport().recovered);
+}
+
 // Reads through a real journal reader but reports the lock as lost a given number of times.
 class LockLosingReader : public wyx::JobsFileReadWriter
 {

@@ -200,6 +200,9 @@ TEST_F(LogView, DetailPanelShowsOnlyWhileAFailedRowIsSelected)
     EXPECT_EQ("detail of bad", view->GetErrorPanel()->GetErrorText());
     EXPECT_GT(view->GetErrorPanel()->GetSize().GetHeight(), 0);
     EXPECT_EQ("1 of 2 items selected.", Footer());
+    Produce(LogLine("later", "ADDED", "Transferred Successfully", folders[0]));
+    EXPECT_TRUE(DetailShown()) << "a job finishing meanwhile leaves the detail being read";
+    EXPECT_EQ("1 of 3 items selected.", Footer());
 
     List()->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
     guitest::Pump();
@@ -213,11 +216,11 @@ TEST_F(LogView, DetailPanelShowsOnlyWhileAFailedRowIsSelected)
     beside.m_col = -2;
     List()->GetEventHandler()->ProcessEvent(beside);
     EXPECT_FALSE(DetailShown());
-    EXPECT_EQ((std::vector<wxString>{"ok", "bad"}), Column(1));
+    EXPECT_EQ((std::vector<wxString>{"ok", "bad", "later"}), Column(1));
 
     List()->SetItemState(0, 0, wxLIST_STATE_SELECTED);
     guitest::Pump();
-    EXPECT_EQ("2 Items", Footer());
+    EXPECT_EQ("3 Items", Footer());
 }
 
 TEST_F(LogView, ColumnsShowTheLongestTextsWhole)

@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <wx/datetime.h>
 #include <wx/init.h>
 
 using namespace viewrules;
@@ -100,6 +101,22 @@ TEST(FooterRules, CountAndSelectionInAnyOrderTheTranslationChooses)
               "1 of 12 items selected.");
     EXPECT_EQ(SelectionFooter("[WYX3Value2] Zeilen, [WYX3Value1] markiert", 1, 12), "12 Zeilen, 1 markiert");
     EXPECT_EQ(SelectionFooter("[WYX3Value1]/[WYX3Value1]", 2, 5), "2/[WYX3Value1]");
+}
+
+TEST(FooterRules, SayWhenTheJournalCouldNotBeReadAndWhenItCameBack)
+{
+    const JournalNoticeTexts texts{"busy since %s", "cannot be read", "back since %s"};
+    const std::time_t at = wxDateTime(6, wxDateTime::Dec, 2026, 10, 42).GetTicks();
+    using State = JournalWatch::State;
+    struct Case
+    {
+        JournalWatch::Report report;
+        const char* notice;
+    };
+    for (const Case& c : {Case{{State::Busy, at, false}, "busy since 10:42"},
+                          Case{{State::Unreadable, at, false}, "cannot be read"},
+                          Case{{State::Readable, at, true}, "back since 10:42"}, Case{{State::Readable, 0, false}, ""}})
+        EXPECT_EQ(JournalNotice(c.report, texts), c.notice);
 }
 
 std::vector<std::size_t> TextOrder(std::vector<const char*> values, bool descending)
