@@ -5,11 +5,8 @@
 #include <benchmark/benchmark.h>
 #include <wx/app.h>
 #include <wx/dcmemory.h>
-#include <wx/evtloop.h>
 #include <wx/frame.h>
-#include <wx/init.h>
 #include <wx/listctrl.h>
-#include <wx/log.h>
 
 #include <memory>
 
@@ -266,31 +263,4 @@ BENCHMARK_TEMPLATE(VirtualScrollOnePage, WxSide)->Unit(benchmark::kMillisecond);
 BENCHMARK_TEMPLATE(InsertTenThousandRows, OurSide)->Unit(benchmark::kMillisecond);
 BENCHMARK_TEMPLATE(InsertTenThousandRows, WxSide)->Unit(benchmark::kMillisecond);
 
-class BenchApp : public wxApp
-{
-public:
-    bool OnInit() override { return true; }
-};
 } // namespace
-
-int main(int argc, char** argv)
-{
-    benchmark::Initialize(&argc, argv);
-    wxApp::SetInstance(new BenchApp);
-    if (!wxEntryStart(argc, argv))
-    {
-        fprintf(stderr, "cannot start the toolkit: is there a display (xvfb-run -a)?\n");
-        return 2;
-    }
-    wxLog::EnableLogging(false);
-    wxTheApp->CallOnInit();
-    {
-        wxEventLoop loop;
-        wxEventLoopActivator activate(&loop);
-        benchmark::RunSpecifiedBenchmarks();
-    }
-    benchmark::Shutdown();
-    wxTheApp->OnExit();
-    wxEntryCleanup();
-    return 0;
-}

@@ -7,19 +7,15 @@
 #include "components/Utility/profilescustomlistctrl.h"
 #include "data/DataLocations.h"
 #include "data/JobLogManager.h"
-#include "platform/os/HeapTuning.h"
 #include "pump/CustomEvents.h"
 #include "views/JobLogView.h"
 
 #include <benchmark/benchmark.h>
 #include <malloc.h>
 #include <wx/app.h>
-#include <wx/evtloop.h>
 #include <wx/ffile.h>
 #include <wx/filename.h>
 #include <wx/frame.h>
-#include <wx/init.h>
-#include <wx/log.h>
 #include <wx/radiobut.h>
 
 #include <memory>
@@ -266,32 +262,4 @@ void HeapPerListedRow(benchmark::State& state)
 }
 BENCHMARK(HeapPerListedRow)->Iterations(1)->Unit(benchmark::kMillisecond);
 
-class BenchApp : public wxApp
-{
-public:
-    bool OnInit() override { return true; }
-};
 } // namespace
-
-int main(int argc, char** argv)
-{
-    wyxos::TuneHeapForListRebuilds();
-    benchmark::Initialize(&argc, argv);
-    wxApp::SetInstance(new BenchApp);
-    if (!wxEntryStart(argc, argv))
-    {
-        fprintf(stderr, "cannot start the toolkit: is there a display (xvfb-run -a)?\n");
-        return 2;
-    }
-    wxLog::EnableLogging(false);
-    wxTheApp->CallOnInit();
-    {
-        wxEventLoop loop;
-        wxEventLoopActivator activate(&loop);
-        benchmark::RunSpecifiedBenchmarks();
-    }
-    benchmark::Shutdown();
-    wxTheApp->OnExit();
-    wxEntryCleanup();
-    return 0;
-}

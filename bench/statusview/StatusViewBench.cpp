@@ -5,18 +5,14 @@
 // wall time includes the X server. Run under xvfb-run -a -s "-screen 0 1280x1024x24".
 #include "components/Utility/CustomListCtrl.h"
 #include "data/JobStatusManager.h"
-#include "platform/os/HeapTuning.h"
 #include "pump/CustomEvents.h"
 #include "views/JobStatusView.h"
 #include "views/StatusRows.h"
 
 #include <benchmark/benchmark.h>
 #include <wx/app.h>
-#include <wx/evtloop.h>
 #include <wx/frame.h>
-#include <wx/init.h>
 #include <wx/intl.h>
-#include <wx/log.h>
 
 #include <algorithm>
 #include <cstdlib>
@@ -190,32 +186,4 @@ BENCHMARK(StatusUpdateFirstWritten)->Arg(10000)->Arg(100000)->Unit(benchmark::kM
 BENCHMARK(WheelTick)->Arg(10000)->Unit(benchmark::kMillisecond);
 BENCHMARK(WheelTickFirstWritten)->Arg(10000)->Unit(benchmark::kMillisecond);
 
-class BenchApp : public wxApp
-{
-public:
-    bool OnInit() override { return true; }
-};
 } // namespace
-
-int main(int argc, char** argv)
-{
-    benchmark::Initialize(&argc, argv);
-    wyxos::TuneHeapForListRebuilds();
-    wxApp::SetInstance(new BenchApp);
-    if (!wxEntryStart(argc, argv))
-    {
-        fprintf(stderr, "cannot start the toolkit: is there a display (xvfb-run -a)?\n");
-        return 2;
-    }
-    wxLog::EnableLogging(false);
-    wxTheApp->CallOnInit();
-    {
-        wxEventLoop loop;
-        wxEventLoopActivator activate(&loop);
-        benchmark::RunSpecifiedBenchmarks();
-    }
-    benchmark::Shutdown();
-    wxTheApp->OnExit();
-    wxEntryCleanup();
-    return 0;
-}
