@@ -45,18 +45,41 @@ bool HasKey(const JournalLine& line, const wxString& key)
     return !key.empty() && TrimmedKey(line.text) == key;
 }
 
+// The journal's bytes, when there are no more than maxBytes of them.
+int ReadBounded(const wxString& path, std::size_t maxBytes, std::string& bytes)
+{
+    // One byte more than the bound tells a journal at the bound from a larger one.
+    if (wyxos::ReadFileContents(path, bytes, maxBytes + 1) != wyxos::ReadResult::Read)
+        return JobFileMissing;
+    return bytes.size() <= maxBytes ? JobOk : JobFileMissing;
+}
+
+// An edit needs every byte to rewrite lines, and none to empty the journal,
+// so that even a journal too large to read can be emptied.
+int ReadForEdit(const wxString& path, Access access, std::string& bytes)
+{
+    if (access == Access::Write)
+        return ReadBounded(path, kMaxJournalBytes, bytes);
+    return wyxos::ReadFileContents(path, bytes, 0) == wyxos::ReadResult::Read ? JobOk : JobFileMissing;
+}
+
+// Every line of the journal; the lines are left as they were when it cannot be read.
+int ReadTexts(const wxString& path, wxArrayString& lines)
+{
+    std::string bytes;
+    const int read = ReadBounded(path, kMaxJournalBytes, bytes);
+    if (read != JobOk)
+        return read;
+    return DecodeJournalTexts(bytes.data(), bytes.size(), lines) ? JobOk : JobFileMissing;
+}
+
 // A journal under its named lock, held from the first read until destruction.
 class LockedJournal
 {
 public:
     explicit LockedJournal(const wxString& path) : m_path(path), m_lock(wxFileName(path).GetName()) {}
 
-    int Read(const std::atomic<bool>* keepWaiting, std::string& bytes)
-    {
-        if (!m_lock.lock(keepWaiting))
-            return JobLockFailed;
-        return wyxos::ReadFileContents(m_path, bytes) == wyxos::ReadResult::Read ? JobOk : JobFileMissing;
-    }
+    bool Lock(const std::atomic<bool>* keepWaiting) { return m_lock.lock(keepWaiting); }
 
     int Replace(const std::vector<JournalLine>& lines)
     {
@@ -75,12 +98,16 @@ int EditLocked(const wxString& path, const std::atomic<bool>* keepWaiting, Acces
     if (path.empty())
         return JobOk;
     LockedJournal locked(path);
+    if (!locked.Lock(keepWaiting))
+        return JobLockFailed;
     std::string bytes;
-    const int read = locked.Read(keepWaiting, bytes);
+    const int read = ReadForEdit(path, access, bytes);
     if (read != JobOk)
         return read;
 
     DecodedJournal journal = DecodeJournal(bytes.data(), bytes.size());
+    if (journal.tooLarge)
+        return JobFileMissing;
     // Rewriting a journal that could not be decoded in full would destroy the
     // undecodable part; readers still get the lines with replacements.
     if (access == Access::Write && !journal.exact)
@@ -96,11 +123,7 @@ int JobsFileReadWriter::ReadJobsHoldingLock(wxArrayString& lines)
 {
     if (m_path.empty())
         return JobOk;
-    std::string bytes;
-    if (wyxos::ReadFileContents(m_path, bytes) != wyxos::ReadResult::Read)
-        return JobFileMissing;
-    DecodeJournalTexts(bytes.data(), bytes.size(), lines);
-    return JobOk;
+    return ReadTexts(m_path, lines);
 }
 
 int JobsFileReadWriter::ReadJobs(wxArrayString& lines)
@@ -108,11 +131,9 @@ int JobsFileReadWriter::ReadJobs(wxArrayString& lines)
     if (m_path.empty())
         return JobOk;
     LockedJournal locked(m_path);
-    std::string bytes;
-    const int read = locked.Read(m_keepWaiting, bytes);
-    if (read == JobOk)
-        DecodeJournalTexts(bytes.data(), bytes.size(), lines);
-    return read;
+    if (!locked.Lock(m_keepWaiting))
+        return JobLockFailed;
+    return ReadTexts(m_path, lines);
 }
 
 int JobsFileReadWriter::AddJob(wxString& line)
@@ -129,7 +150,7 @@ int JobsFileReadWriter::AddJob(wxString& line)
                           // A last line without a line break would otherwise run into the new one.
                           if (!journal.empty() && journal.back().end == LineEnd::None)
                               journal.back().end = LineEnd::CrLf;
-                          journal.push_back(JournalLine{line, LineEnd::CrLf});
+                          journal.push_back(JournalLine{line, LineEnd::CrLf, std::string()});
                           return true;
                       });
 }

@@ -1,12 +1,18 @@
 #pragma once
 
 #include <atomic>
+#include <cstddef>
 
 #include <wx/arrstr.h>
 #include <wx/string.h>
 
 namespace wyx
 {
+
+// The largest journal one read takes in: a hundred thousand jobs take about
+// 15 MiB. A larger file reads as JobFileMissing and the caller keeps what it
+// had, rather than one planted or runaway file taking the process's memory.
+constexpr std::size_t kMaxJournalBytes = std::size_t(64) << 20;
 
 // Results of the journal operations.
 enum JobResult : int

@@ -1,5 +1,6 @@
 #include "platform/os/FileContents.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <climits>
 #include <cstdlib>
@@ -92,7 +93,7 @@ void SyncFolder(const std::string& folder)
 
 } // namespace
 
-ReadResult ReadFileContents(const wxString& path, std::string& bytes)
+ReadResult ReadFileContents(const wxString& path, std::string& bytes, std::size_t maxBytes)
 {
     // O_NONBLOCK: opening a FIFO placed at the path must not wait for a writer.
     Descriptor fd(::open(path.utf8_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
@@ -104,11 +105,11 @@ ReadResult ReadFileContents(const wxString& path, std::string& bytes)
 
     std::string content;
     if (info.st_size > 0)
-        content.reserve(static_cast<std::size_t>(info.st_size));
+        content.reserve(std::min(static_cast<std::size_t>(info.st_size), maxBytes));
     std::vector<char> block(64 * 1024);
-    for (;;)
+    while (content.size() < maxBytes)
     {
-        const ssize_t got = ::read(fd.Get(), block.data(), block.size());
+        const ssize_t got = ::read(fd.Get(), block.data(), std::min(block.size(), maxBytes - content.size()));
         if (got < 0)
         {
             if (errno == EINTR)

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <cstddef>
+#include <limits>
 #include <string>
 
 #include <wx/string.h>
@@ -14,8 +16,10 @@ enum class ReadResult
     Unreadable // not a regular file, or opening or reading failed
 };
 
-// Reads a whole regular file. Never blocks on a FIFO or device at the path.
-ReadResult ReadFileContents(const wxString& path, std::string& bytes);
+// Reads a whole regular file, or its first maxBytes bytes. Never blocks on a
+// FIFO or device at the path.
+ReadResult ReadFileContents(const wxString& path, std::string& bytes,
+                            std::size_t maxBytes = std::numeric_limits<std::size_t>::max());
 
 // Replaces the content of an existing file so that a reader, or a crash at any
 // moment, sees either the old or the new content in full: the bytes go to a new
