@@ -1,9 +1,10 @@
 #include "app/UiLanguage.h"
 
-#include <wx/language.h>
+#include "app/language/LanguageChoice.h"
+#include "app/language/LanguageSources.h"
+#include "data/DataLocations.h"
 
-// Until the language files are read, the system's language decides.
 int ChooseUiLanguage(bool reload)
 {
-    return wxLANGUAGE_DEFAULT;
+    return ChooseUiLanguageFor(GetApplicationVersion(reload), uilanguage::SystemLanguageSources());
 }
