@@ -1,5 +1,7 @@
 #include "components/Utility/CustomComboBox.h"
 
+#include "components/Utility/ComboAutomation.h"
+
 #include "pump/CustomEvents.h"
 
 #include <wx/dc.h>
@@ -21,8 +23,44 @@ bool CustomComboBox::Create(wxWindow* parent, wxWindowID id, const wxPoint& pos,
 {
     if (!wxOwnerDrawnComboBox::Create(parent, id, wxEmptyString, pos, size, wxCB_READONLY))
         return false;
-    SetPopupControl(new CustomComboPopup);
+    auto* popup = new CustomComboPopup;
+    SetPopupControl(popup);
+    m_automation = std::make_unique<ComboAutomation>(*this, *popup);
     return true;
+}
+
+void CustomComboPopup::OnPopup()
+{
+    wxVListBoxComboPopup::OnPopup();
+    TellShownChanged();
+}
+
+void CustomComboPopup::OnDismiss()
+{
+    wxVListBoxComboPopup::OnDismiss();
+    TellShownChanged();
+}
+
+void CustomComboPopup::TellShownChanged()
+{
+    // The box records the popup's new state only after these calls return.
+    // The handler is looked up when the call runs: one removed meanwhile is not called.
+    if (m_shownChanged)
+        CallAfter(
+            [this]
+            {
+                if (m_shownChanged)
+                    m_shownChanged();
+            });
+}
+
+CustomComboBox::CustomComboBox() = default;
+
+CustomComboBox::~CustomComboBox() = default;
+
+const automation::AutomationSource* CustomComboBox::GetAutomationSource() const
+{
+    return m_automation ? &m_automation->Source() : nullptr;
 }
 
 bool CustomComboBox::Enable(bool enable)

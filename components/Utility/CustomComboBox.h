@@ -3,11 +3,30 @@
 #include <wx/odcombo.h>
 
 #include <functional>
+#include <memory>
+
+class ComboAutomation;
+namespace automation
+{
+class AutomationSource;
+}
 
 // The list popup of the filter box. It draws nothing of its own: the box's
 // owner-draw callbacks do the drawing for both.
 class CustomComboPopup : public wxVListBoxComboPopup
 {
+public:
+    // Called, once the event in progress is done, after the popup opens or
+    // closes (the box sends no event for either); empty for none.
+    void SetShownChangedHandler(std::function<void()> handler) { m_shownChanged = std::move(handler); }
+
+    void OnPopup() override;
+    void OnDismiss() override;
+
+private:
+    void TellShownChanged();
+
+    std::function<void()> m_shownChanged;
 };
 
 // Read-only filter drop-down of the views. Long entries are shortened with
@@ -21,10 +40,14 @@ public:
     static constexpr int kEnterButtonId = 5100;
     static constexpr int kItemHeight = 18;
 
-    CustomComboBox() = default;
+    CustomComboBox();
+    ~CustomComboBox() override;
 
     bool Create(wxWindow* parent, wxWindowID id, const wxPoint& pos = wxDefaultPosition,
                 const wxSize& size = wxDefaultSize);
+
+    // The box as outside tools read it; null before Create.
+    const automation::AutomationSource* GetAutomationSource() const;
 
     void SetShowTooltip(bool show) { showTooltip = show; }
     bool GetShowTooltip() const { return showTooltip; }
@@ -53,6 +76,7 @@ private:
     wxString SelectedText() const;
 
     bool showTooltip = false;
+    std::unique_ptr<ComboAutomation> m_automation;
 
     wxDECLARE_EVENT_TABLE();
 };

@@ -1,5 +1,6 @@
 #include "components/Utility/profilescustomlistctrl.h"
 
+#include "components/Utility/ListAutomation.h"
 #include "platform/themer/Themer.h"
 
 #include <algorithm>
@@ -18,6 +19,8 @@ wxEND_EVENT_TABLE()
 {
     Create(style, parent, id, pos, size, listStyle, validator, name);
 }
+
+ProfilesKelvoProfilesListCtrl::ProfilesKelvoProfilesListCtrl() = default;
 
 ProfilesKelvoProfilesListCtrl::~ProfilesKelvoProfilesListCtrl() = default;
 
@@ -49,7 +52,19 @@ bool ProfilesKelvoProfilesListCtrl::Create(const headerStyle* style, wxWindow* p
     m_main->SetOwnBackgroundColour(GetBackgroundColour());
     LayoutChildren();
     SetInitialSize(size);
+    m_automation = std::make_unique<ListAutomation>(*this);
     return true;
+}
+
+const automation::AutomationSource* ProfilesKelvoProfilesListCtrl::GetAutomationSource() const
+{
+    return m_automation ? &m_automation->Source() : nullptr;
+}
+
+void ProfilesKelvoProfilesListCtrl::RowsChanged()
+{
+    if (m_automation)
+        m_automation->RowsChanged();
 }
 
 wxSize ProfilesKelvoProfilesListCtrl::DoGetBestClientSize() const
@@ -183,12 +198,15 @@ long ProfilesKelvoProfilesListCtrl::InsertItem(const wxListItem& info)
     const long at = m_main->InsertLine(info.GetId(), std::move(line));
     if (at >= 0 && (mask & wxLIST_MASK_STATE))
         SetItemState(at, info.GetState(), info.m_stateMask);
+    RowsChanged();
     return at;
 }
 
 long ProfilesKelvoProfilesListCtrl::InsertItems(long index, std::vector<ProfilesKelvoListLineData> lines)
 {
-    return m_main->InsertLines(index, std::move(lines));
+    const long at = m_main->InsertLines(index, std::move(lines));
+    RowsChanged();
+    return at;
 }
 
 bool ProfilesKelvoProfilesListCtrl::SetItem(long index, int col, const wxString& label, int imageId)
@@ -417,6 +435,7 @@ bool ProfilesKelvoProfilesListCtrl::DeleteItem(long item)
 {
     if (!m_main->DeleteLine(item))
         return false;
+    RowsChanged();
     wxListEvent event(wxEVT_LIST_DELETE_ITEM, GetId());
     event.SetEventObject(this);
     event.SetIndex(item);
@@ -428,6 +447,7 @@ bool ProfilesKelvoProfilesListCtrl::DeleteAllItems()
 {
     const bool hadItems = GetItemCount() > 0;
     m_main->DeleteAllLines();
+    RowsChanged();
     if (hadItems)
     {
         wxListEvent event(wxEVT_LIST_DELETE_ALL_ITEMS, GetId());
@@ -440,6 +460,7 @@ bool ProfilesKelvoProfilesListCtrl::DeleteAllItems()
 void ProfilesKelvoProfilesListCtrl::SetItemCount(long count)
 {
     m_main->SetItemCount(count);
+    RowsChanged();
 }
 
 void ProfilesKelvoProfilesListCtrl::RefreshItem(long item)

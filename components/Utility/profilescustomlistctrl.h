@@ -16,6 +16,12 @@
 #include <memory>
 #include <vector>
 
+class ListAutomation;
+namespace automation
+{
+class AutomationSource;
+}
+
 // Creation record of the list: the header's look. The background colour is
 // carried for the callers; the list uses the bitmap, font and text colour.
 struct headerStyle
@@ -37,7 +43,7 @@ constexpr int kHeaderImageList = 5;
 class ProfilesKelvoProfilesListCtrl : public wxNavigationEnabled<wxControl>
 {
 public:
-    ProfilesKelvoProfilesListCtrl() = default;
+    ProfilesKelvoProfilesListCtrl();
     ProfilesKelvoProfilesListCtrl(const headerStyle* style, wxWindow* parent, wxWindowID id = wxID_ANY,
                                   const wxPoint& pos = wxDefaultPosition, const wxSize& size = wxDefaultSize,
                                   long listStyle = wxLC_REPORT,
@@ -107,6 +113,12 @@ public:
     ProfilesKelvoListHeaderWindow* GetHeaderWindow() const { return m_header; }
     const headerStyle* GetHeaderStyle() const { return m_headerStyle.get(); }
 
+    // What accessibility tools call the list ("Jobs in progress").
+    void SetAccessibleName(const wxString& name) { m_accessibleName = name; }
+    const wxString& GetAccessibleName() const { return m_accessibleName; }
+    // The list as outside tools read it; null before Create.
+    const automation::AutomationSource* GetAutomationSource() const;
+
     // Virtual-mode callbacks, asked per cell.
     virtual wxString OnGetItemText(long item, long column) const;
     virtual int OnGetItemImage(long item, long column) const;
@@ -118,10 +130,15 @@ protected:
 private:
     void OnSize(wxSizeEvent& event);
     void LayoutChildren();
+    // Tells the tools that read the list that its rows changed.
+    void RowsChanged();
 
     std::unique_ptr<headerStyle> m_headerStyle;
     ProfilesKelvoListMainWindow* m_main = nullptr;
     ProfilesKelvoListHeaderWindow* m_header = nullptr;
+    wxString m_accessibleName;
+    // Last of the members: it goes before the parts it reads.
+    std::unique_ptr<ListAutomation> m_automation;
 
     wxDECLARE_EVENT_TABLE();
 };
