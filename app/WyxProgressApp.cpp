@@ -1,5 +1,7 @@
 #include "app/WyxProgressApp.h"
 
+#include <cstdlib>
+
 #include <wx/filename.h>
 #include <wx/iconbndl.h>
 #include <wx/image.h>
@@ -74,9 +76,31 @@ bool CWyxProgressApp::OnInit()
     m_notifier = std::make_unique<JobsProgressNotify>();
     m_listener->AddListener(kListenerName, m_notifier.get());
     m_listener->StartTimer();
+    // Polling stops as the window closes, before any of its pages goes.
+    frame->Bind(wxEVT_CLOSE_WINDOW, &CWyxProgressApp::OnFrameClose, this);
 
     frame->Show();
     return true;
+}
+
+void CWyxProgressApp::OnFrameClose(wxCloseEvent& event)
+{
+    StopPolling();
+    event.Skip();
+}
+
+void CWyxProgressApp::StopPolling()
+{
+    if (!m_listener)
+        return;
+    m_listener->StopTimer();
+    if (m_listener->ThreadOutlivedStop())
+    {
+        // The polling thread is stuck in a system call and still uses the
+        // models: nothing may be torn down under it. Closing the window must
+        // end the program all the same, and it has nothing left to save.
+        std::_Exit(0);
+    }
 }
 
 int CWyxProgressApp::OnExit()
@@ -84,7 +108,7 @@ int CWyxProgressApp::OnExit()
     if (!m_listener || !m_notifier)
         return 0;
     // The thread is joined before the notifier it calls goes away.
-    m_listener->StopTimer();
+    StopPolling();
     m_listener->RemoveListener(kListenerName);
     m_listener.reset();
     m_notifier.reset();

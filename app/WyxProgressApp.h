@@ -24,6 +24,11 @@ public:
     wxAppTraits* CreateTraits() override;
 
 private:
+    void OnFrameClose(wxCloseEvent& event);
+    // Stops and joins the polling thread; ends the process at once when the
+    // thread does not come back from a system call.
+    void StopPolling();
+
     // Destroyed in reverse order: the crash reporter is unloaded first.
     std::unique_ptr<JobsProgressNotify> m_notifier;
     std::unique_ptr<ServerEventListner> m_listener;

@@ -22,7 +22,7 @@ bool EventBus::AddChannel(const ChannelKey& key)
     wxCriticalSectionLocker guard(m_lock);
     if (m_channels.count(key) != 0)
         return false;
-    m_channels.emplace(key, std::make_unique<std::vector<wxEvtHandler*>>());
+    m_channels.emplace(key, std::make_unique<std::vector<wxWeakRef<wxEvtHandler>>>());
     return true;
 }
 
@@ -34,7 +34,7 @@ bool EventBus::Subscribe(const ChannelKey& key, wxEvtHandler* handler)
     const auto channel = m_channels.find(key);
     if (channel == m_channels.end())
         return false;
-    channel->second->push_back(handler);
+    channel->second->emplace_back(handler);
     return true;
 }
 
@@ -47,7 +47,10 @@ bool EventBus::Publish(const ChannelKey& key, const wxEvent& event)
     if (channel == m_channels.end())
         return false;
     for (wxEvtHandler* handler : *channel->second)
-        wxPostEvent(handler, event);
+    {
+        if (handler != nullptr)
+            wxPostEvent(handler, event);
+    }
     return true;
 }
 
@@ -59,10 +62,13 @@ int EventBus::Unsubscribe(wxEvtHandler* handler)
     int removed = 0;
     for (auto& channel : m_channels)
     {
-        std::vector<wxEvtHandler*>& handlers = *channel.second;
-        const auto end = std::remove(handlers.begin(), handlers.end(), handler);
-        removed += static_cast<int>(handlers.end() - end);
-        handlers.erase(end, handlers.end());
+        std::vector<wxWeakRef<wxEvtHandler>>& handlers = *channel.second;
+        removed += static_cast<int>(std::count_if(handlers.begin(), handlers.end(),
+                                                  [handler](wxEvtHandler* subscribed) { return subscribed == handler; }));
+        // Handlers that went without unsubscribing go now as well.
+        handlers.erase(std::remove_if(handlers.begin(), handlers.end(), [handler](wxEvtHandler* subscribed)
+                                      { return subscribed == handler || subscribed == nullptr; }),
+                       handlers.end());
     }
     return removed;
 }

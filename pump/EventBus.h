@@ -7,6 +7,7 @@
 #include <wx/event.h>
 #include <wx/string.h>
 #include <wx/thread.h>
+#include <wx/weakref.h>
 
 // Identifies a channel of the bus. Keys are ordered, and so looked up, by id
 // alone; every key in the program has an empty name.
@@ -48,6 +49,7 @@ private:
     EventBus(const EventBus&) = delete;
     EventBus& operator=(const EventBus&) = delete;
 
-    std::map<ChannelKey, std::unique_ptr<std::vector<wxEvtHandler*>>> m_channels;
+    // Weak: a handler destroyed without unsubscribing is skipped, not posted to.
+    std::map<ChannelKey, std::unique_ptr<std::vector<wxWeakRef<wxEvtHandler>>>> m_channels;
     wxCriticalSection m_lock;
 };

@@ -3,12 +3,28 @@
 #include "data/JobLogManager.h"
 #include "data/JobStatusManager.h"
 
+namespace
+{
+// A model whose pass throws (a journal too large to hold, say) skips that
+// pass; the other journal is still read.
+template <typename Model> void RefreshSkippingFailure(Model& model)
+{
+    try
+    {
+        model.Refresh();
+    }
+    catch (...)
+    {
+    }
+}
+} // namespace
+
 // Each model re-reads its journal only when it changed and publishes its own
 // update; their results are not needed here.
 void JobsProgressNotify::Notify()
 {
-    JobLogManager::GetInstance().Refresh();
-    JobStatusManager::GetInstance().Refresh();
+    RefreshSkippingFailure(JobLogManager::GetInstance());
+    RefreshSkippingFailure(JobStatusManager::GetInstance());
 }
 
 void JobsProgressNotify::SetRunning(bool running)

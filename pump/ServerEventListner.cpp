@@ -49,6 +49,11 @@ bool ServerEventListner::CreateOsThread(TimerThread& thread)
     return thread.Create() == wxTHREAD_NO_ERROR;
 }
 
+bool ServerEventListner::RunOsThread(TimerThread& thread)
+{
+    return thread.Run() == wxTHREAD_NO_ERROR;
+}
+
 bool ServerEventListner::StartTimer()
 {
     if (m_thread)
@@ -59,7 +64,7 @@ bool ServerEventListner::StartTimer()
     if (!CreateOsThread(*m_thread))
         return false;
     m_threadState = ThreadState::Created;
-    if (m_thread->Run() != wxTHREAD_NO_ERROR)
+    if (!RunOsThread(*m_thread))
         return false;
     m_threadState = ThreadState::Running;
     return true;
@@ -74,12 +79,22 @@ bool ServerEventListner::StopTimer()
     switch (m_threadState)
     {
     case ThreadState::Running:
-        m_thread->Wait(wxTHREAD_WAIT_BLOCK);
+        if (m_thread->WaitUntilFinished(std::chrono::milliseconds(kStopLimitMs)))
+        {
+            m_thread->Wait(wxTHREAD_WAIT_BLOCK);
+        }
+        else
+        {
+            // Stuck in a system call: joining could take for ever.
+            m_threadOutlivedStop = true;
+            static_cast<void>(m_thread.release());
+        }
         break;
     case ThreadState::Created:
-        // Delete releases a thread still parked before Entry, which then ends
-        // without running it, and joins it.
+        // A thread parked before Entry ends without running it once released,
+        // and wx deletes a thread that never ran itself: the object is no longer ours.
         m_thread->Delete(nullptr, wxTHREAD_WAIT_BLOCK);
+        static_cast<void>(m_thread.release());
         break;
     case ThreadState::NotCreated:
         break;

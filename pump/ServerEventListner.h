@@ -43,8 +43,14 @@ public:
     // True when the polling thread runs; its first pass starts at once.
     bool StartTimer();
     // Stops every listener's pass in progress, then ends and joins the thread.
-    // False when there was no thread.
+    // False when there was no thread. A thread still inside a pass after
+    // kStopLimitMs is left to the end of the process (see ThreadOutlivedStop).
     bool StopTimer();
+    // True when the last StopTimer gave up on a thread stuck in a system call:
+    // the models it uses must then outlive it, so the process ends at once.
+    bool ThreadOutlivedStop() const { return m_threadOutlivedStop; }
+
+    static constexpr int kStopLimitMs = 1500;
 
     bool HasTimer() const { return m_thread != nullptr; }
 
@@ -53,14 +59,15 @@ public:
     int GetPollingInterval() const { return m_pollingInterval; }
 
 protected:
-    // Creates the operating-system thread of a new TimerThread.
+    // Creates the operating-system thread of a new TimerThread, and lets it run.
     virtual bool CreateOsThread(TimerThread& thread);
+    virtual bool RunOsThread(TimerThread& thread);
 
 private:
     enum class ThreadState
     {
         NotCreated, // the object exists but no OS thread: nothing to wait for
-        Created,    // an OS thread parked before Entry: must be released, then joined
+        Created,    // an OS thread parked before Entry: released, it ends and deletes its object
         Running,
     };
 
@@ -70,6 +77,7 @@ private:
     std::vector<ListenerEntry> m_entries;
     std::unique_ptr<TimerThread> m_thread;
     ThreadState m_threadState = ThreadState::NotCreated;
+    bool m_threadOutlivedStop = false;
     int m_pollingInterval = kPollingIntervalMs;
     wxCriticalSection m_lock;
 };

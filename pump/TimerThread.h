@@ -1,6 +1,7 @@
 #pragma once
 
 #include <atomic>
+#include <chrono>
 #include <condition_variable>
 #include <mutex>
 
@@ -24,6 +25,8 @@ public:
 
     void RequestStop();
     bool IsStopRequested() const { return m_stop; }
+    // Waits at most `limit` for Entry to return; true once it has.
+    bool WaitUntilFinished(std::chrono::milliseconds limit);
     // True while the thread waits between two passes.
     bool IsAsleep() const { return m_asleep; }
 
@@ -35,6 +38,7 @@ private:
     std::atomic<int> m_interval{kInitialIntervalMs};
     std::atomic<bool> m_stop{false};
     std::atomic<bool> m_asleep{false};
+    bool m_finished = false; // under m_sleepLock
     std::mutex m_sleepLock;
     std::condition_variable m_wakeUp;
 };

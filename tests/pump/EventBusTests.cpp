@@ -201,6 +201,18 @@ private:
 
 } // namespace
 
+TEST(EventBusUnsubscribe, AHandlerThatForgotToUnsubscribeIsNeverPostedTo)
+{
+    auto* forgetful = new wxEvtHandler;
+    ASSERT_TRUE(EventBus::Get().Subscribe(ChannelKey(2), forgetful));
+    delete forgetful;
+    // Under AddressSanitizer a post to the deleted handler fails here.
+    wxCommandEvent update(wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS);
+    EXPECT_TRUE(EventBus::Get().Publish(ChannelKey(2), update));
+    wxEvtHandler other;
+    EXPECT_EQ(EventBus::Get().Unsubscribe(&other), 0) << "the dead entry is dropped, and not counted";
+}
+
 TEST(EventBusUnsubscribe, HandlersDestroyedWhileTheThreadPublishesAreNeverReached)
 {
     std::atomic<bool> publishing{true};
