@@ -169,6 +169,14 @@ TEST_F(JournalFormat, ReadPrintsTheLinesAsStoredEmptyOnesIncluded)
     EXPECT_EQ(ReadLines(StatusJournal()), (Lines{"1\ta\tADDED", "", "2\tb\tADDED", "", "3\tc"}));
 }
 
+TEST_F(JournalFormat, OutputThatCannotBeWrittenIsReported)
+{
+    WriteBytes(StatusJournal(), "1\ta\tADDED\r\n");
+    for (const std::vector<std::string>& arguments :
+         {std::vector<std::string>{"status", "read"}, std::vector<std::string>{"--help"}})
+        EXPECT_EQ(RunTool(arguments, "exec > /dev/full;").status, 4) << arguments.front();
+}
+
 TEST_F(JournalFormat, AppendKeepsExistingLineEndsAndEndsNewLinesWithCrLf)
 {
     // The last line has no line break of its own: it gets one rather than

@@ -106,9 +106,11 @@ std::string ShellQuoted(const std::string& text)
     return quoted + "'";
 }
 
-ToolRun RunTool(const std::vector<std::string>& arguments, const std::string& prefix)
+namespace
 {
-    std::string command = prefix + " exec " + ShellQuoted(WYX_JOURNAL_TOOL);
+
+ToolRun RunCommand(std::string command, const std::vector<std::string>& arguments)
+{
     for (const std::string& argument : arguments)
         command += " " + ShellQuoted(argument);
     ToolRun run;
@@ -122,6 +124,21 @@ ToolRun RunTool(const std::vector<std::string>& arguments, const std::string& pr
     const int status = ::pclose(process);
     run.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
     return run;
+}
+
+} // namespace
+
+ToolRun RunTool(const std::vector<std::string>& arguments, const std::string& prefix)
+{
+    return RunCommand(prefix + " exec " + ShellQuoted(WYX_JOURNAL_TOOL), arguments);
+}
+
+ToolRun RunToolAs(unsigned uid, const std::vector<std::string>& arguments)
+{
+    const std::string id = std::to_string(uid);
+    return RunCommand("exec setpriv --reuid=" + id + " --regid=" + id + " --clear-groups " +
+                          ShellQuoted(WYX_JOURNAL_TOOL),
+                      arguments);
 }
 
 bool WaitUntilBlockedOn(const std::string& lockFile, const std::function<bool()>& finished)

@@ -56,6 +56,8 @@ struct ToolRun
 // Runs wyx-journal with the arguments through sh; prefix is shell text put
 // before the command (ulimit, trap).
 ToolRun RunTool(const std::vector<std::string>& arguments, const std::string& prefix = std::string());
+// RunTool as another user (root only: through util-linux setpriv).
+ToolRun RunToolAs(unsigned uid, const std::vector<std::string>& arguments);
 std::string ShellQuoted(const std::string& text);
 
 // Polls the kernel's lock table until some process or thread is blocked

@@ -13,6 +13,8 @@ namespace
 {
 
 constexpr int kUsageError = 2;
+// After wyx::JobResult's: what was read could not all be written out.
+constexpr int kOutputFailed = 4;
 
 const char* const kUsage =
     "usage: wyx-journal JOURNAL OPERATION [ARGUMENT]\n"
@@ -36,7 +38,8 @@ const char* const kUsage =
     "The journal's lock is waited for as long as another process holds it.\n"
     "\n"
     "exit status: 0 done, 1 journal missing or unreadable, 2 lock not taken or\n"
-    "usage error, 3 journal could not be written (it is unchanged)\n";
+    "usage error, 3 journal could not be written (it is unchanged), 4 the output\n"
+    "could not be written (a full disk, say)\n";
 
 enum class Operation
 {
@@ -198,6 +201,17 @@ void ReportFailure(std::FILE* err, int result, const wxString& journal)
     std::fprintf(err, "wyx-journal: %s: %s\n", static_cast<const char*>(journal.utf8_str()), problem);
 }
 
+// Output goes out in blocks, so a failure to write it (a full disk) shows only
+// when it is flushed; whoever reads our output must not take what arrived for
+// the whole journal.
+int FlushOutput(std::FILE* out, std::FILE* err, int result)
+{
+    if (std::fflush(out) == 0 && !std::ferror(out))
+        return result;
+    std::fputs("wyx-journal: the output could not be written\n", err);
+    return result == wyx::JobOk ? kOutputFailed : result;
+}
+
 // One operation per line of input ("\n" or "\r\n" ends a line).
 int RunForEachInputLine(Command command, std::FILE* in, std::FILE* out, std::FILE* err)
 {
@@ -224,8 +238,7 @@ int RunForEachInputLine(Command command, std::FILE* in, std::FILE* out, std::FIL
             return result;
         }
     }
-    std::fflush(out);
-    return wyx::JobOk;
+    return FlushOutput(out, err, wyx::JobOk);
 }
 
 } // namespace
@@ -235,7 +248,7 @@ int RunJournalCommand(int argc, const char* const* argv, std::FILE* in, std::FIL
     if (argc == 2 && (wxString(argv[1]) == "--help" || wxString(argv[1]) == "-h"))
     {
         std::fputs(kUsage, out);
-        return 0;
+        return FlushOutput(out, err, 0);
     }
     Command command;
     const wxString problem = Parse(argc, argv, command);
@@ -245,6 +258,5 @@ int RunJournalCommand(int argc, const char* const* argv, std::FILE* in, std::FIL
         return RunForEachInputLine(command, in, out, err);
     const int result = Run(command, out);
     ReportFailure(err, result, command.journal);
-    std::fflush(out);
-    return result;
+    return FlushOutput(out, err, result);
 }
