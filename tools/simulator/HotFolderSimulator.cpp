@@ -1,13 +1,14 @@
 #include "tools/simulator/HotFolderSimulator.h"
 
+#include <string>
+
 #include <wx/datetime.h>
-#include <wx/ffile.h>
-#include <wx/filefn.h>
 #include <wx/filename.h>
 #include <wx/time.h>
 #include <wx/utils.h>
 
 #include "data/DataLocations.h"
+#include "platform/os/FileContents.h"
 #include "platform/os/SystemPaths.h"
 
 namespace
@@ -25,24 +26,10 @@ bool MakeFolder(const wxString& path)
     return wxFileName::DirExists(path) || wxFileName::Mkdir(path, wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
 }
 
-// Replaces a file's content as one step, so a reader never sees half of it.
-bool ReplaceFile(const wxString& path, const wxString& text)
+std::string Utf8(const wxString& text)
 {
-    const wxString temporary = path + ".new";
-    {
-        wxFFile file(temporary, "wb");
-        if (!file.IsOpened() || !file.Write(text, wxConvUTF8) || !file.Close())
-            return false;
-    }
-    return wxRenameFile(temporary, path, true);
-}
-
-bool CreateIfMissing(const wxString& path)
-{
-    if (wxFileName::FileExists(path))
-        return true;
-    wxFFile file(path, "ab");
-    return file.IsOpened();
+    const wxScopedCharBuffer bytes = text.utf8_str();
+    return std::string(bytes.data(), bytes.length());
 }
 
 std::unique_ptr<wyx::IJobReadWriter> JournalAt(const wxString& path)
@@ -93,14 +80,15 @@ bool HotFolderSimulator::Prepare(wxString& problem)
     ini += "[Servers]\n";
     for (const wxString& server : m_traffic->Servers())
         ini += server + "\n";
-    if (!ReplaceFile(m_dataDirectory + "HotFolders.ini", ini))
+    // Put in place as one step, so the program never reads half of it.
+    if (!wyxos::WriteFileContents(m_dataDirectory + "HotFolders.ini", Utf8(ini)))
     {
         problem = "cannot write " + m_dataDirectory + "HotFolders.ini";
         return false;
     }
     for (const char* journal : {"TiveraJobsStatusFile.txt", "TiveraJobsLogFile.txt"})
     {
-        if (!CreateIfMissing(m_dataDirectory + journal))
+        if (!wyxos::CreateFileIfMissing(m_dataDirectory + journal))
         {
             problem = "cannot create " + m_dataDirectory + journal;
             return false;
@@ -165,9 +153,9 @@ void HotFolderSimulator::Finish(SimulatedJob& job)
     if (job.fails)
     {
         ++m_totals.failed;
-        wxFFile marker(job.hotFolderPath + "/" + kServiceFolder + "/Error.er", "ab");
-        if (marker.IsOpened())
-            marker.Write(job.key + "\t" + job.failureStatus + "\n", wxConvUTF8);
+        if (!wyxos::AppendFileContents(job.hotFolderPath + "/" + kServiceFolder + "/Error.er",
+                                       Utf8(job.key + "\t" + job.failureStatus + "\n")))
+            ++m_totals.markerErrors;
     }
     else
     {

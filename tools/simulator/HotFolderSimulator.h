@@ -23,6 +23,9 @@ public:
         unsigned succeeded = 0;
         unsigned failed = 0;
         unsigned journalErrors = 0;
+        unsigned markerErrors = 0; // Error.er files that could not be written
+
+        bool AllWritten() const { return journalErrors == 0 && markerErrors == 0; }
     };
 
     // shouldStop is asked between operations; true ends the run at once.

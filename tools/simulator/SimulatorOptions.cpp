@@ -21,7 +21,10 @@ const char* const kSimulatorUsage =
     "                      (default: /srv/hotfolders below WYX_SYSTEM_ROOT)\n"
     "  --help              this text\n"
     "\n"
-    "SIGTERM or SIGINT ends it after the journal operation under way.\n";
+    "SIGTERM or SIGINT ends it after the journal operation under way.\n"
+    "\n"
+    "exit status: 0 done, 1 could not set up, 2 usage error, 3 some journal\n"
+    "operations or error markers failed (counted on standard error)\n";
 
 namespace
 {

@@ -3,11 +3,14 @@
 
 #include <wx/init.h>
 
+#include "platform/os/FileContents.h"
 #include "tools/simulator/HotFolderSimulator.h"
 #include "tools/simulator/SimulatorOptions.h"
 
 namespace
 {
+
+constexpr int kSomeWritesFailed = 3;
 
 volatile std::sig_atomic_t g_stopRequested = 0;
 
@@ -38,6 +41,9 @@ int main(int argc, char** argv)
         return 0;
     }
 
+    // Past the file size limit a journal operation fails and is counted,
+    // instead of the signal ending us beside a temporary file.
+    wyxos::FailWritesBeyondFileSizeLimit();
     std::signal(SIGTERM, RequestStop);
     std::signal(SIGINT, RequestStop);
 
@@ -56,5 +62,7 @@ int main(int argc, char** argv)
                 totals.succeeded, totals.failed, g_stopRequested ? " (stopped)" : "");
     if (totals.journalErrors > 0)
         std::fprintf(stderr, "wyx-simulator: %u journal operations failed\n", totals.journalErrors);
-    return 0;
+    if (totals.markerErrors > 0)
+        std::fprintf(stderr, "wyx-simulator: %u error markers could not be written\n", totals.markerErrors);
+    return totals.AllWritten() ? 0 : kSomeWritesFailed;
 }
