@@ -1,9 +1,10 @@
 #include "platform/datasource/WyxDataSource.h"
 
-#include <wx/ffile.h>
 #include <wx/filename.h>
 
+#include "platform/os/FileContents.h"
 #include "platform/os/SystemPaths.h"
+#include "platform/os/TextDecoding.h"
 
 namespace
 {
@@ -17,15 +18,15 @@ enum class Section
     Servers
 };
 
+// The configuration is small; anything larger is not ours and is read no further.
+constexpr std::size_t kMaxConfigurationBytes = 1024 * 1024;
+
 wxString ReadWholeFile(const wxString& path)
 {
-    if (!wxFileName::FileExists(path))
+    std::string bytes;
+    if (wyxos::ReadFileContents(path, bytes, kMaxConfigurationBytes) != wyxos::ReadResult::Read)
         return wxString();
-    wxFFile file(path, "rb");
-    wxString text;
-    if (!file.IsOpened() || !file.ReadAll(&text, wxConvUTF8))
-        return wxString();
-    return text;
+    return wyxos::DecodeConfigurationText(bytes);
 }
 
 void ReadConfiguration(wxArrayString* hotFolders, wxArrayString* servers)
@@ -109,9 +110,9 @@ long WyxDataSource::ChangeHotfolderIcon(const wxString& hotFolderPath, const boo
     m_iconChanges.push_back({hotFolderPath, errorState});
     // The log is a convenience for other processes; a folder that cannot be
     // written does not make the call fail.
-    wxFFile log(IconLogPath(), "ab");
-    if (log.IsOpened())
-        log.Write(hotFolderPath + "\t" + (errorState ? "1" : "0") + "\n", wxConvUTF8);
+    const wxString line = hotFolderPath + "\t" + (errorState ? "1" : "0") + "\n";
+    const wxScopedCharBuffer utf8 = line.utf8_str();
+    wyxos::AppendFileContents(IconLogPath(), std::string(utf8.data(), utf8.length()));
     return 0;
 }
 

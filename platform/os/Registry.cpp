@@ -1,16 +1,12 @@
 #include "platform/os/Registry.h"
 
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
-#include <cerrno>
 #include <string>
 
-#include <wx/strconv.h>
 #include <wx/tokenzr.h>
 
+#include "platform/os/FileContents.h"
 #include "platform/os/SystemPaths.h"
+#include "platform/os/TextDecoding.h"
 
 namespace wyxos
 {
@@ -26,50 +22,6 @@ wxString NormalisedName(const wxString& name)
     return result.Lower();
 }
 
-// Reads a regular file without ever blocking on it: a FIFO or device put in
-// the file's place is refused rather than waited for.
-bool ReadRegularFile(const wxString& path, std::string& bytes)
-{
-    const int fd = ::open(path.utf8_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY | O_NONBLOCK);
-    if (fd < 0)
-        return false;
-    struct stat info;
-    if (::fstat(fd, &info) != 0 || !S_ISREG(info.st_mode))
-    {
-        ::close(fd);
-        return false;
-    }
-    char buffer[8192];
-    while (bytes.size() < kMaxFileBytes)
-    {
-        const ssize_t got = ::read(fd, buffer, sizeof buffer);
-        if (got < 0 && errno == EINTR)
-            continue;
-        if (got <= 0)
-            break;
-        bytes.append(buffer, static_cast<std::size_t>(got));
-    }
-    ::close(fd);
-    if (bytes.size() > kMaxFileBytes)
-        bytes.resize(kMaxFileBytes);
-    return true;
-}
-
-// UTF-8 as written by any current editor; anything else is taken as Latin-1 so
-// that a stray byte never empties the whole file.
-wxString DecodeText(const std::string& bytes)
-{
-    std::size_t start = 0;
-    if (bytes.compare(0, 3, "\xEF\xBB\xBF") == 0)
-        start = 3;
-    if (start == bytes.size())
-        return wxString();
-    const wxString utf8 = wxString::FromUTF8(bytes.data() + start, bytes.size() - start);
-    if (!utf8.empty())
-        return utf8;
-    return wxString(bytes.data() + start, wxConvISO8859_1, bytes.size() - start);
-}
-
 } // namespace
 
 wxString RegistryFilePath()
@@ -80,9 +32,9 @@ wxString RegistryFilePath()
 RegistryFile RegistryFile::Load(const wxString& path)
 {
     std::string bytes;
-    if (!ReadRegularFile(path, bytes))
+    if (ReadFileContents(path, bytes, kMaxFileBytes) != ReadResult::Read)
         return RegistryFile();
-    return Parse(DecodeText(bytes));
+    return Parse(DecodeConfigurationText(bytes));
 }
 
 RegistryFile RegistryFile::Parse(const wxString& text)

@@ -1,5 +1,7 @@
 #include <gtest/gtest.h>
 
+#include <sys/stat.h>
+
 #include <cstdlib>
 #include <cstring>
 
@@ -118,6 +120,20 @@ TEST_F(DataSourceInstance, ReadsTheFileAnewAtEachCall)
     EXPECT_EQ(AsVector(hotFolders), AsVector({"/srv/a", "/srv/b"}));
     EXPECT_EQ(WyxDataSource::GetInstance().GetServersList(servers), 1);
     EXPECT_EQ(AsVector(servers), AsVector({"PRN-2"}));
+}
+
+TEST_F(DataSourceInstance, AStrayByteCostsOnlyItsOwnLineAndAFifoIsNotWaitedOn)
+{
+    WriteConfiguration("[HotFolders]\n/srv/Z\xC3\xBCrich\n/srv/M\xFCnchen\n[Servers]\nPRN-1\n");
+    wxArrayString hotFolders, servers;
+    EXPECT_EQ(WyxDataSource::GetInstance().GetHotFoldersList(hotFolders), 2);
+    EXPECT_EQ(AsVector(hotFolders), (std::vector<wxString>{wxString::FromUTF8("/srv/Z\xC3\xBCrich"),
+                                                           wxString::FromUTF8("/srv/M\xC3\xBCnchen")}));
+    EXPECT_EQ(WyxDataSource::GetInstance().GetServersList(servers), 1);
+
+    wxRemoveFile(m_dataDir + "HotFolders.ini");
+    ASSERT_EQ(::mkfifo((m_dataDir + "HotFolders.ini").utf8_str(), 0666), 0);
+    EXPECT_EQ(WyxDataSource::GetInstance().GetServersList(servers), 0);
 }
 
 TEST_F(DataSourceInstance, RecordsEachIconChangeInMemoryAndInTheLog)
