@@ -1,6 +1,9 @@
 #include "platform/os/SystemPaths.h"
 
 #include <cstdlib>
+#include <string>
+
+#include <unistd.h>
 
 namespace wyxos
 {
@@ -11,6 +14,19 @@ wxString SystemRoot()
     if (root == nullptr || *root == '\0')
         return "/";
     return wxString::FromUTF8(root);
+}
+
+void ResolveSystemRoot()
+{
+    const char* root = std::getenv("WYX_SYSTEM_ROOT");
+    if (root == nullptr || *root == '\0' || *root == '/')
+        return;
+    char* folder = ::getcwd(nullptr, 0);
+    if (folder == nullptr)
+        return;
+    const std::string absolute = std::string(folder) + "/" + root;
+    std::free(folder);
+    ::setenv("WYX_SYSTEM_ROOT", absolute.c_str(), 1);
 }
 
 wxString UnderSystemRoot(const wxString& absolutePath)

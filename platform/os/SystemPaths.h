@@ -10,6 +10,11 @@ namespace wyxos
 // unprivileged user can run everything inside a temporary folder.
 wxString SystemRoot();
 
+// Makes a relative WYX_SYSTEM_ROOT absolute, against the working folder at the
+// time of the call. Every program calls it first thing: the program later
+// changes its working folder, and it and the tools must mean the same folder.
+void ResolveSystemRoot();
+
 // absolutePath is a machine-wide path such as "/var/lib"; the result is the same
 // path below the system root, without a trailing separator unless given one.
 wxString UnderSystemRoot(const wxString& absolutePath);

@@ -1,10 +1,12 @@
 #include <wx/init.h>
 
 #include "platform/os/FileContents.h"
+#include "platform/os/SystemPaths.h"
 #include "tools/journal/JournalCommand.h"
 
 int main(int argc, char** argv)
 {
+    wyxos::ResolveSystemRoot();
     // A journal that would outgrow the file size limit is then left as it was
     // and reported (3), where the signal would end us beside our temporary file.
     wyxos::FailWritesBeyondFileSizeLimit();

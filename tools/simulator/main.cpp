@@ -4,6 +4,7 @@
 #include <wx/init.h>
 
 #include "platform/os/FileContents.h"
+#include "platform/os/SystemPaths.h"
 #include "tools/simulator/HotFolderSimulator.h"
 #include "tools/simulator/SimulatorOptions.h"
 
@@ -23,6 +24,7 @@ extern "C" void RequestStop(int)
 
 int main(int argc, char** argv)
 {
+    wyxos::ResolveSystemRoot();
     wxInitializer initializer(argc, argv);
     if (!initializer.IsOk())
         return 1;
