@@ -13,6 +13,7 @@
 #include "app/MainFrame.h"
 #include "app/UiLanguage.h"
 #include "app/WyxAppTraits.h"
+#include "platform/os/InstanceLock.h"
 #include "platform/services/WyxLogger.h"
 #include "pump/JobsProgressNotify.h"
 #include "pump/ServerEventListner.h"
@@ -50,9 +51,8 @@ wxAppTraits* CWyxProgressApp::CreateTraits()
 bool CWyxProgressApp::OnInit()
 {
     // The user id in the name lets every user of a shared machine run one copy.
-    m_instanceChecker = std::make_unique<wxSingleInstanceChecker>(
-        wxString::Format("WyxProgress-%s", wxGetUserId()), wxString());
-    if (m_instanceChecker->IsAnotherRunning())
+    m_instanceLock = std::make_unique<wyxos::InstanceLock>(wxString::Format("WyxProgress-%s", wxGetUserId()));
+    if (m_instanceLock->IsAnotherRunning())
         return false;
 
     wxInitAllImageHandlers();

@@ -4,11 +4,14 @@
 
 #include <wx/app.h>
 #include <wx/intl.h>
-#include <wx/snglinst.h>
 
 #include "app/CrashReporterLoader.h"
 
 class JobsProgressNotify;
+namespace wyxos
+{
+class InstanceLock;
+}
 class ServerEventListner;
 
 // The application object: one window per user, polling of the journals from
@@ -32,7 +35,7 @@ private:
     // Destroyed in reverse order: the crash reporter is unloaded first.
     std::unique_ptr<JobsProgressNotify> m_notifier;
     std::unique_ptr<ServerEventListner> m_listener;
-    std::unique_ptr<wxSingleInstanceChecker> m_instanceChecker;
+    std::unique_ptr<wyxos::InstanceLock> m_instanceLock;
     wxLocale m_locale;
     CrashReporterLoader m_crashReporter;
 };

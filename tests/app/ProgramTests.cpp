@@ -2,6 +2,7 @@
 // (Xvfb, without a window manager), closed through the window's close request.
 #include <gtest/gtest.h>
 
+#include <pwd.h>
 #include <sys/stat.h>
 
 #include <algorithm>
@@ -148,6 +149,26 @@ TEST_F(ProgramTest, ASecondCopyOfTheSameUserEndsAtOnceWithoutAWindow)
     EXPECT_FALSE(first.HasEnded());
 
     CloseAndExpectCleanExit(first, window);
+}
+
+TEST_F(ProgramTest, ACopyThatWasKilledDoesNotKeepTheNextOneFromStarting)
+{
+    const std::vector<std::string> environment = Environment("home");
+    {
+        Program killed(WYX_PROGRAM, environment);
+        ASSERT_NE(x.WaitForWindow(killed), 0u) << killed.Outcome();
+        ::kill(killed.Pid(), SIGKILL);
+        killed.Wait();
+    }
+    // Whatever a lock file says now (here: the id of a live process of this
+    // user, as after the killed copy's id was given to another process).
+    const std::string name = std::string("WyxProgress-") + ::getpwuid(::geteuid())->pw_name;
+    for (const std::string& leftover : {"home/run/" + name + ".lock", "home/" + name})
+        std::ofstream(folder.Path() / leftover) << ::getpid() << "\n";
+    Program next(WYX_PROGRAM, environment);
+    const Window window = x.WaitForWindow(next);
+    ASSERT_NE(window, 0u) << "no window: the program " << next.Outcome();
+    CloseAndExpectCleanExit(next, window);
 }
 
 TEST_F(ProgramTest, AnotherUserRunsItsOwnCopyBesideTheFirst)
