@@ -35,9 +35,12 @@ struct ColumnSpec
     int referenceWidth;
 };
 
-const ColumnSpec kColumns[logrows::kLogColumnCount] = {{" ", 25},           {"File Name", 160},
-                                                       {"Hot Folder", 160}, {"Server", 155},
-                                                       {"Start Time", 125}, {"Status", 150}};
+const ColumnSpec kColumns[logrows::kLogColumnCount] = {{" ", 25},
+                                                       {wxTRANSLATE("File Name"), 160},
+                                                       {wxTRANSLATE("Hot Folder"), 160},
+                                                       {wxTRANSLATE("Server"), 155},
+                                                       {wxTRANSLATE("Start Time"), 125},
+                                                       {wxTRANSLATE("Status"), 150}};
 
 // Pixel sizes of the layout were chosen for an average character of 7 pixels;
 // a wider font (DejaVu Sans) would cut "Transferred Successfully", the times
