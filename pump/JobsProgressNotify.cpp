@@ -2,6 +2,7 @@
 
 #include "data/JobLogManager.h"
 #include "data/JobStatusManager.h"
+#include "platform/os/HeapTuning.h"
 
 namespace
 {
@@ -25,6 +26,7 @@ void JobsProgressNotify::Notify()
 {
     RefreshSkippingFailure(JobLogManager::GetInstance());
     RefreshSkippingFailure(JobStatusManager::GetInstance());
+    wyxos::ReturnLargeFreeHeap();
 }
 
 void JobsProgressNotify::SetRunning(bool running)

@@ -18,4 +18,12 @@ bool TuneHeapForListRebuilds()
     return noFastBins && keepTop && heapBlocks;
 }
 
+bool ReturnLargeFreeHeap(std::size_t keptForRebuilds)
+{
+    const struct mallinfo2 heap = mallinfo2();
+    if (heap.fordblks <= keptForRebuilds || heap.fordblks <= heap.uordblks)
+        return false;
+    return malloc_trim(0) == 1;
+}
+
 } // namespace wyxos

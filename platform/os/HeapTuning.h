@@ -1,5 +1,7 @@
 #pragma once
 
+#include <cstddef>
+
 namespace wyxos
 {
 
@@ -10,5 +12,12 @@ namespace wyxos
 // at a later allocation. Resident memory stays at its high-water mark. Call
 // once, before anything allocates much; false when a setting was refused.
 bool TuneHeapForListRebuilds();
+
+// Hands free heap memory back to the system once there is more of it than a
+// rebuild of the largest list that fits a journal needs, and more than is in
+// use: after a huge journal has shrunk, gigabytes must not stay resident for
+// ever. Cheap when there is little to give back; true when it gave some.
+// The default keeps what two rebuilds of a hundred thousand jobs take.
+bool ReturnLargeFreeHeap(std::size_t keptForRebuilds = std::size_t(512) << 20);
 
 } // namespace wyxos
