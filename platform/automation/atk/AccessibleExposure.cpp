@@ -780,16 +780,19 @@ void ItemExtents(AtkComponent* component, gint* x, gint* y, gint* width, gint* h
     int top = 0;
     if (!source || !ItemExists(*item) || !ItemRectInOwner(*item, *source, rect))
         return;
-    *width = rect.Width();
-    *height = rect.Height();
     if (coords == ATK_XY_PARENT)
     {
         *x = rect.left;
         *y = rect.top;
+        *width = rect.Width();
+        *height = rect.Height();
         return;
     }
+    // Not on the screen (a hidden page, a closed popup): nowhere.
     if (!ClientOrigin(*source, left, top))
         return;
+    *width = rect.Width();
+    *height = rect.Height();
     *x = left + rect.left;
     *y = top + rect.top;
     if (coords == ATK_XY_WINDOW)
