@@ -133,6 +133,7 @@ void JobLogView::CreateFilterRow()
 
     folderBox = new CustomComboBox;
     folderBox->Create(this, kFolderBoxId, wxDefaultPosition, wxSize(ScaledWidth(this, 110), -1));
+    folderBox->SetName("folderFilter");
     folderBox->Append(AllFoldersEntry());
     folderBox->SetSelection(0);
     folderBox->SetShowTooltip(true);
@@ -174,6 +175,9 @@ void JobLogView::CreateList()
     const headerStyle style = viewimages::MakeHeaderStyle();
     logList = new ProfilesKelvoProfilesListCtrl(&style, this, kLogListId, wxDefaultPosition, wxDefaultSize,
                                                 wxLC_SINGLE_SEL | wxLC_REPORT | wxLC_HRULES | wxLC_VRULES);
+    // How accessibility tools and scripts name and find the table.
+    logList->SetName("jobLogList");
+    logList->SetAccessibleName(_("Finished jobs"));
     logList->SetAlternateRowColour(ThemeOf("ListControl").alternateRowColour);
     logList->SetImageList(rowImages.get(), wxIMAGE_LIST_SMALL);
     logList->SetImageList(sortImages.get(), kHeaderImageList);

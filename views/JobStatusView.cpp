@@ -98,6 +98,7 @@ void JobStatusView::BuildFilterRow()
              wxALIGN_CENTER_VERTICAL | wxALL, 5);
     serverBox = new CustomComboBox;
     serverBox->Create(this, kServerBoxId, wxDefaultPosition, wxSize(viewmetrics::ScaledWidth(this, 100), -1));
+    serverBox->SetName("serverFilter");
     serverBox->Append(AllServersEntry());
     // Wide enough for its first entry whatever the font and language.
     const int entryWidth = serverBox->GetTextExtent(AllServersEntry()).x + serverBox->GetButtonSize().x + 12;
@@ -115,6 +116,9 @@ void JobStatusView::BuildList()
     const headerStyle header = viewimages::MakeHeaderStyle();
     jobList = new CustomListCtrl(&header, this, wxID_ANY, wxDefaultPosition, wxDefaultSize,
                                  wxLC_SINGLE_SEL | wxLC_VIRTUAL | wxLC_REPORT | wxLC_HRULES | wxLC_VRULES);
+    // How accessibility tools and scripts name and find the table.
+    jobList->SetName("jobStatusList");
+    jobList->SetAccessibleName(_("Jobs in progress"));
     jobList->SetAlternateRowColour(ThemeOf("ListControl").alternateRowColour);
     jobList->SetImageList(busyImages.get(), wxIMAGE_LIST_SMALL);
     jobList->SetImageList(sortImages.get(), kHeaderImageList);
