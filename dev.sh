@@ -8,7 +8,8 @@ ROOT=$PWD
 
 PACKAGES=(cmake ninja-build g++ clang libclang-rt-14-dev pkg-config libwxgtk3.2-dev
           libpango1.0-dev libcairo2-dev googletest libgtest-dev libbenchmark-dev libx11-dev xvfb xauth x11-utils xdotool imagemagick
-          locales-all fonts-dejavu-core util-linux)
+          locales-all fonts-dejavu-core util-linux
+          libgtk-3-dev libatk1.0-dev at-spi2-core dbus-daemon gir1.2-atspi-2.0 python3-gi)
 
 install_missing() {
     local missing=() p
