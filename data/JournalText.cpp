@@ -457,6 +457,29 @@ bool IsFallbackReadOf(const wxString& text, const std::string& bytes)
     return true;
 }
 
+// The lines as UTF-8, except that lines the fallback read and nobody changed
+// go back as they came; the first line only where keepFirstAsRead says so.
+std::string EncodeLines(const std::vector<JournalLine>& lines, bool keepFirstAsRead)
+{
+    std::string out;
+    for (std::size_t index = 0; index < lines.size(); ++index)
+    {
+        const JournalLine& line = lines[index];
+        if ((index > 0 || keepFirstAsRead) && IsFallbackReadOf(line.text, line.undecoded))
+        {
+            out += line.undecoded;
+        }
+        else
+        {
+            const wchar_t* const data = line.text.wc_str();
+            for (std::size_t at = 0, length = line.text.length(); at < length; ++at)
+                AppendUtf8(out, static_cast<wxUint32>(data[at]));
+        }
+        out += LineEndBytes(line.end);
+    }
+    return out;
+}
+
 } // namespace
 
 DecodedJournal DecodeJournal(const char* bytes, std::size_t size)
@@ -502,21 +525,14 @@ bool DecodeJournalTexts(const char* bytes, std::size_t size, wxArrayString& line
 
 std::string EncodeJournal(const std::vector<JournalLine>& lines)
 {
-    std::string out;
-    for (const JournalLine& line : lines)
-    {
-        if (IsFallbackReadOf(line.text, line.undecoded))
-        {
-            out += line.undecoded;
-        }
-        else
-        {
-            const wchar_t* const data = line.text.wc_str();
-            for (std::size_t at = 0, length = line.text.length(); at < length; ++at)
-                AppendUtf8(out, static_cast<wxUint32>(data[at]));
-        }
-        out += LineEndBytes(line.end);
-    }
+    std::string out = EncodeLines(lines, true);
+    // Kept as they were, the bytes of a first line that was no UTF-8 could
+    // begin the file with a UTF-16 or UTF-32 mark (a line "\xFF\xFE..." that
+    // followed a UTF-8 mark, or a line that another's deletion moved to the
+    // top), and the next read would take the whole file for that encoding.
+    // Such a line goes as UTF-8, which never holds the bytes of those marks.
+    if (!out.empty() && IsWideMark(wxConvAuto::DetectBOM(out.data(), out.size())))
+        out = EncodeLines(lines, false);
     return out;
 }
 

@@ -65,6 +65,13 @@ INSTANTIATE_TEST_SUITE_P(
                       EditCase{"Clear", {"clear"}, ""}),
     [](const ::testing::TestParamInfo<EditCase>& info) { return std::string(info.param.name); });
 
+TEST_F(JournalEdit, ALineThatWouldStartTheFileWithAUtf16MarkGoesAsUtf8)
+{
+    WriteBytes(StatusJournal(), "1\ta\tADDED\r\n\xFF\xFE\tb\tADDED\r\n3\t\xFF\tADDED\r\n");
+    ASSERT_EQ(RunTool({"status", "delete", "1"}).status, 0);
+    EXPECT_EQ(ReadBytes(StatusJournal()), "\xC3\xBF\xC3\xBE\tb\tADDED\r\n3\t\xFF\tADDED\r\n");
+}
+
 TEST_F(JournalEdit, EachLineReadsInItsOwnEncoding)
 {
     WriteBytes(StatusJournal(), kJournal);

@@ -187,6 +187,9 @@ INSTANTIATE_TEST_SUITE_P(
                   false},
         BytesCase{
             "Utf32WithPartialUnit", Bytes({0, 0, 0xFE, 0xFF, 0, 0, 0, 'a', 0, 0}), {"a\xEF\xBF\xBD"}, false},
+        // Kept as they came, these bytes would begin the rewrite with a UTF-16 mark.
+        BytesCase{
+            "Utf8MarkThenBytesOfAUtf16Mark", "\xEF\xBB\xBF\xFF\xFE\t1\r\n", {"\xC3\xBF\xC3\xBE\t1"}, true},
         BytesCase{"Utf8MarkThenInvalid",
                   "\xEF\xBB\xBF"
                   "1\t\xFF\r\n",

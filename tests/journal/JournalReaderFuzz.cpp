@@ -1,6 +1,7 @@
 // Arbitrary bytes as a journal file: reading never fails or crashes, valid
-// UTF-8 reads as the library's decoder reads it, and a journal that decodes
-// exactly survives a rewrite line for line.
+// UTF-8 reads as the library's decoder reads it, a journal that decodes
+// exactly survives a rewrite line for line, and one without a wide mark byte
+// for byte.
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
@@ -8,6 +9,7 @@
 #include <memory>
 #include <string>
 
+#include <wx/convauto.h>
 #include <wx/init.h>
 #include <wx/strconv.h>
 
@@ -24,6 +26,14 @@ void RemoveFolder()
 {
     std::error_code ignored;
     std::filesystem::remove_all(g_folder, ignored);
+}
+
+bool IsWideText(const std::string& bytes)
+{
+    if (bytes.empty())
+        return false;
+    const wxBOM bom = wxConvAuto::DetectBOM(bytes.data(), bytes.size());
+    return bom == wxBOM_UTF16BE || bom == wxBOM_UTF16LE || bom == wxBOM_UTF32BE || bom == wxBOM_UTF32LE;
 }
 
 } // namespace
@@ -58,6 +68,22 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     const wyx::DecodedJournal decoded = wyx::DecodeJournal(reinterpret_cast<const char*>(data), size);
     if (decoded.lines.size() != lines.size())
         std::abort();
+
+    // Without a UTF-16 or UTF-32 mark every line goes back byte for byte,
+    // UTF-8 or not; only marks at the start go. Where that would make the
+    // file begin with such a mark, it must not.
+    const std::string input(reinterpret_cast<const char*>(data), size);
+    if (!IsWideText(input))
+    {
+        std::size_t mark = 0;
+        while (input.compare(mark, 3, "\xEF\xBB\xBF") == 0)
+            mark += 3;
+        const std::string asRead = input.substr(mark);
+        const std::string rewritten = wyx::EncodeJournal(decoded.lines);
+        const bool kept = IsWideText(asRead) ? !IsWideText(rewritten) : rewritten == asRead;
+        if (!decoded.exact || !kept)
+            std::abort();
+    }
 
     // Valid UTF-8 reads as the library's own strict decoder reads it, split at
     // the line ends; marks at the start are no text.
