@@ -109,7 +109,7 @@ TEST_F(GermanWindowTest, ALoggedJobAndTheSelectionFooterAreGerman)
     for (long row = 0; row < list->GetItemCount(); ++row)
         statuses.push_back(list->GetItemText(row, 5));
     std::sort(statuses.begin(), statuses.end());
-    EXPECT_EQ(statuses, Texts({"Erfolgreich übertragen", "Übertragung fehlgeschlagen"}));
+    EXPECT_EQ(statuses, Texts({"Erfolgreich übertragen", "Übertragungsfehler"}));
 
     list->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
     ASSERT_TRUE(PumpUntil([this] { return Log()->GetFooter()->GetStatusText(0).Contains("ausgew"); }));
