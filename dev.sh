@@ -2,13 +2,14 @@
 # The two set-up commands of the README (Debian 12, run as root or with sudo):
 #   ./dev.sh run    install what is missing, build, start the program on a live demo
 #   ./dev.sh test   install what is missing, build, run every test (also under the sanitizers)
+#   WYX_DEMO_LANG=de_DE ./dev.sh run    the demo in one of the program's languages
 set -euo pipefail
 cd "$(dirname "$0")"
 ROOT=$PWD
 
 PACKAGES=(cmake ninja-build g++ clang libclang-rt-14-dev pkg-config libwxgtk3.2-dev
           libpango1.0-dev libcairo2-dev googletest libgtest-dev libbenchmark-dev libx11-dev xvfb xauth x11-utils xdotool imagemagick
-          locales-all fonts-dejavu-core util-linux
+          locales-all fonts-dejavu-core util-linux gettext wx3.2-i18n
           libgtk-3-dev libatk1.0-dev at-spi2-core dbus-daemon gir1.2-atspi-2.0 python3-gi)
 
 install_missing() {
@@ -84,6 +85,36 @@ cmd_test() {
     [ "$TOTAL_FAILED" -eq 0 ]
 }
 
+# Names the build's folder as the demo's install folder, so that the program
+# finds its catalogs (LocalizedStrings) there. With WYX_DEMO_LANG (a code of the
+# per-user language file, e.g. de_DE) the demo runs a copy of the program whose
+# own WyxConfig.cfg says version 3.3, the version that lets that file decide,
+# and writes the file; the build's configuration stays as it is for everyone
+# else. Prints the folder of the program to run.
+prepare_demo_language() {
+    local demo=$1 bin=$2
+    mkdir -p "$demo/etc/kelvo"
+    printf '[SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve]\nInstallPath=%s\n' "$bin" >"$demo/etc/kelvo/registry.ini"
+    if [ -z "${WYX_DEMO_LANG:-}" ]; then
+        echo "$bin"
+        return
+    fi
+    local copy="$demo/opt/wyxprogress"
+    mkdir -p "$copy" "$XDG_CONFIG_HOME/Corvane Quillet"
+    cp "$bin/WyxProgress" "$bin"/*.so "$bin/wyx_folder.ico" "$copy/"
+    cat >"$copy/WyxConfig.cfg" <<'CONFIG'
+<?xml version="1.0" encoding="UTF-8"?>
+<Configuration>
+  <WyxConfiguration>
+    <Entry key="APP_WYX_VERSION" value="3.3"/>
+    <Entry key="ICON_SHELL_NOTIFY" value="0"/>
+  </WyxConfiguration>
+</Configuration>
+CONFIG
+    printf '%s\n' "$WYX_DEMO_LANG" >"$XDG_CONFIG_HOME/Corvane Quillet/current.lang"
+    echo "$copy"
+}
+
 cmd_run() {
     install_missing
     configure_and_build build -DCMAKE_BUILD_TYPE=RelWithDebInfo
@@ -93,12 +124,15 @@ cmd_run() {
     export XDG_CONFIG_HOME=$demo/home/.config XDG_RUNTIME_DIR=$demo/run
     mkdir -p "$XDG_CONFIG_HOME" "$XDG_RUNTIME_DIR" && chmod 700 "$XDG_RUNTIME_DIR"
     echo "== demo data in $demo (WYX_SYSTEM_ROOT)"
+    local program
+    program=$(prepare_demo_language "$demo" "$bin")
+    [ -z "${WYX_DEMO_LANG:-}" ] || echo "== language $WYX_DEMO_LANG: program copy in $program, version 3.3"
     "$bin/wyx-simulator" --duration 3600 &
     SIMULATOR=$!
     trap 'kill "$SIMULATOR" 2>/dev/null || true' EXIT
     sleep 1
     if [ -n "${DISPLAY:-}" ]; then
-        "$bin/WyxProgress"
+        "$program/WyxProgress"
     else
         local shot="$ROOT/out/screenshot.png"
         mkdir -p "$ROOT/out"
@@ -106,9 +140,9 @@ cmd_run() {
         xvfb-run -a -s "-screen 0 1024x768x24" bash -c '
             "$1" & app=$!
             sleep 8
-            window=$(xdotool search --name "Status & Log" | head -n 1)
+            window=$(xdotool search --onlyvisible --pid $app | head -n 1)
             import -window "${window:-root}" "$2"
-            kill $app; wait $app || true' _ "$bin/WyxProgress" "$shot"
+            kill $app; wait $app || true' _ "$program/WyxProgress" "$shot"
         echo "== screenshot of the window: $shot"
     fi
 }
