@@ -47,9 +47,15 @@ done
 
 ticks() { awk '{ print $14 + $15 }' "/proc/$app/stat"; }
 per_second=$(getconf CLK_TCK)
+report() {
+    awk -v used="$2" -v hz="$per_second" -v s="$seconds" -v what="$1" 'BEGIN {
+        printf "%s for %d s: %.2f s of CPU = %.2f %% of one core\n", what, s, used / hz, 100 * used / hz / s
+    }'
+}
+before=$(ticks)
+sleep "$seconds"
+report "idle, no tool attached" $(($(ticks) - before))
+# The tool attaches, reads a box and registers for every event, then waits.
 before=$(ticks)
 inspect --only serverFilter --listen "$seconds" >/dev/null
-after=$(ticks)
-awk -v used=$((after - before)) -v hz="$per_second" -v s="$seconds" 'BEGIN {
-    printf "idle with a tool attached for %d s: %.2f s of CPU = %.2f %% of one core\n", s, used / hz, 100 * used / hz / s
-}'
+report "idle, a tool attached and listening" $(($(ticks) - before))
