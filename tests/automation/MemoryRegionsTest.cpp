@@ -48,11 +48,18 @@ TEST(PointerCheck, AStructureMustLieWhollyInOneAccessibleRegion)
         bool readable;
         bool writable;
     } cases[] = {
-        {0x1800, 4, false, false},        {0x2800, 4, false, false}, {0x3000, 4, true, false},
-        {0x3ffc, 4, true, false},         {0x3ffd, 4, false, false}, {0x4800, 1, false, false},
-        {0x5000, 8, true, true},          {0x5ffc, 8, true, true}, // neighbours with the same access are one
-                                                                   // region
-        {0x6ff8, 9, false, false},        {0, 1, false, false},      {0x5000, 0, false, false},
+        {0x1800, 4, false, false},
+        {0x2800, 4, false, false},
+        {0x3000, 4, true, false},
+        {0x3ffc, 4, true, false},
+        {0x3ffd, 4, false, false},
+        {0x4800, 1, false, false},
+        {0x5000, 8, true, true},
+        // Neighbours with the same access are one region.
+        {0x5ffc, 8, true, true},
+        {0x6ff8, 9, false, false},
+        {0, 1, false, false},
+        {0x5000, 0, false, false},
         {0x5000, SIZE_MAX, false, false},
     };
     for (const auto& c : cases)
