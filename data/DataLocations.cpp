@@ -77,6 +77,7 @@ bool ConfigStore::Load()
 
 bool ConfigStore::Lookup(const wxString& key, wxString& value) const
 {
+    std::lock_guard<std::mutex> guard(m_lock);
     const auto found = m_entries.find(key);
     if (found == m_entries.end())
         return false;
@@ -91,7 +92,7 @@ bool ConfigStore::LoadFile(const wxString& path)
     wxLogNull quiet; // a broken file adds nothing and says nothing
     wxXmlDocument document;
     if (document.Load(path, "UTF-8"))
-        InsertEntries(document, m_entries);
+        Merge(document);
     return true;
 }
 
@@ -101,7 +102,17 @@ void ConfigStore::LoadDocument(const char* bytes, std::size_t size)
     wxMemoryInputStream stream(bytes, size);
     wxXmlDocument document;
     if (document.Load(stream, "UTF-8"))
-        InsertEntries(document, m_entries);
+        Merge(document);
+}
+
+void ConfigStore::Merge(const wxXmlDocument& document)
+{
+    // Parsed outside the lock; readers on other threads see the old entries or all the new ones.
+    std::map<wxString, wxString> entries;
+    InsertEntries(document, entries);
+    std::lock_guard<std::mutex> guard(m_lock);
+    // A key once loaded keeps its value, as a key first met in this document takes its own.
+    m_entries.insert(entries.begin(), entries.end());
 }
 
 wxString GetConfigFilePath()

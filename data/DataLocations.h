@@ -2,6 +2,7 @@
 
 #include <cstddef>
 #include <map>
+#include <mutex>
 
 #include <wx/string.h>
 
@@ -11,6 +12,8 @@ wxString GetDataDirectory();
 
 // The key-value configuration read from "WyxConfig.cfg" beside the executable.
 // Keys are only ever inserted: a value, once known, keeps it for the process.
+class wxXmlDocument;
+
 class ConfigStore
 {
 public:
@@ -33,6 +36,10 @@ private:
     ConfigStore(const ConfigStore&) = delete;
     ConfigStore& operator=(const ConfigStore&) = delete;
 
+    void Merge(const wxXmlDocument& document);
+
+    // Process-wide: any thread may look a key up while another loads.
+    mutable std::mutex m_lock;
     std::map<wxString, wxString> m_entries;
 };
 
