@@ -285,3 +285,19 @@ TEST_F(ProgramWithJournalTest, AJobWrittenByAnotherProcessBecomesARowAndLeavesWi
     EXPECT_EQ(NextPicture(window, shown), empty) << "the row went and the footer counts 0 again";
     CloseAndExpectCleanExit(program, window);
 }
+
+TEST_F(ProgramWithJournalTest, FifosPlantedWhereTheLocksAndAJournalBelongKeepNothingFromClosing)
+{
+    const std::filesystem::path locks = folder.Path() / "root/dev/shm";
+    std::filesystem::create_directories(locks);
+    const std::filesystem::path data = folder.Path() / "root/var/lib/Corvane/HotFolders";
+    for (const std::filesystem::path& fifo : {locks / "TiveraJobsStatusFile.lock", locks / "TiveraJobsLogFile.lock",
+                                              data / "TiveraJobsLogFile.txt"})
+        ASSERT_EQ(::mkfifo(fifo.c_str(), 0666), 0) << fifo;
+    Program program(WYX_PROGRAM, Environment("home"));
+    const Window window = x.WaitForWindow(program);
+    ASSERT_NE(window, 0u) << "no window: the program " << program.Outcome();
+    ::usleep(2500000); // a few polls, each meeting the FIFOs
+    EXPECT_FALSE(program.HasEnded());
+    CloseAndExpectCleanExit(program, window);
+}
