@@ -7,6 +7,7 @@ endfunction()
 
 # wyx_layer(name dir KIND STATIC|SHARED LIBS ...): one library per layer. The
 # include root is the repository, so code says #include "data/JobRecord.h".
+# A shared layer is installed with the programs that load it.
 function(wyx_layer name dir)
     cmake_parse_arguments(L "" "KIND" "LIBS" ${ARGN})
     wyx_layer_sources(_src ${dir})
@@ -20,4 +21,7 @@ function(wyx_layer name dir)
     add_library(${name} ${L_KIND} ${_src})
     target_include_directories(${name} PUBLIC ${PROJECT_SOURCE_DIR})
     target_link_libraries(${name} PUBLIC ${L_LIBS})
+    if(L_KIND STREQUAL "SHARED")
+        wyx_install_library(${name})
+    endif()
 endfunction()

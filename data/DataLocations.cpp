@@ -9,6 +9,7 @@
 #include <wx/xml/xml.h>
 
 #include "platform/os/CommonFolders.h"
+#include "platform/os/SystemPaths.h"
 
 namespace
 {
@@ -115,12 +116,29 @@ void ConfigStore::Merge(const wxXmlDocument& document)
     m_entries.insert(entries.begin(), entries.end());
 }
 
+wxString FindProgramFile(const wxString& name)
+{
+    const wxFileName executable(wxStandardPaths::Get().GetExecutablePath());
+    const wxString beside = executable.GetPathWithSep() + name;
+    if (wxFileName::Exists(beside))
+        return beside;
+    wxFileName installed(executable.GetPath(), name);
+    installed.RemoveLastDir();
+    installed.AppendDir("share");
+    installed.AppendDir("wyxprogress");
+    return wxFileName::Exists(installed.GetFullPath()) ? installed.GetFullPath() : beside;
+}
+
 wxString GetConfigFilePath()
 {
-    wxFileName path(wxStandardPaths::Get().GetExecutablePath());
-    path.SetName("WyxConfig");
-    path.SetExt("cfg");
-    return path.GetFullPath();
+    const wxString name = "WyxConfig.cfg";
+    const wxString beside = wxFileName(wxStandardPaths::Get().GetExecutablePath()).GetPathWithSep() + name;
+    if (wxFileName::FileExists(beside))
+        return beside;
+    const wxString administrators = wyxos::UnderSystemRoot("/etc/wyxprogress/") + name;
+    if (wxFileName::FileExists(administrators))
+        return administrators;
+    return FindProgramFile(name);
 }
 
 wxString GetApplicationVersion(bool reload)

@@ -43,7 +43,15 @@ private:
     std::map<wxString, wxString> m_entries;
 };
 
-// "WyxConfig.cfg" beside the running executable.
+// A file or folder the program ships: beside the running executable (the
+// build folder, where the development build finds it), else in
+// ../share/wyxprogress next to the executable's folder (an installed program,
+// whatever its prefix). The path beside the executable when neither exists.
+wxString FindProgramFile(const wxString& name);
+
+// "WyxConfig.cfg": beside the running executable when there is one there (the
+// development build), else the administrator's <system root>/etc/wyxprogress
+// one, else the installed read-only defaults (see FindProgramFile).
 wxString GetConfigFilePath();
 
 // "APP_WYX_VERSION", or empty; reload first calls ConfigStore::Load.

@@ -1,6 +1,7 @@
 // Draws every image the program embeds, at the pixel sizes it uses, and the
-// window icon file. Shapes are laid out on a 16-unit grid and scaled, so the
-// 32 and 48 pixel icons are drawn, not enlarged.
+// window icon file, and the program's icon for the menus at every size of the
+// icon theme and as SVG. Shapes are laid out on a 16-unit grid and scaled, so
+// the larger icons are drawn, not enlarged.
 #include <wx/app.h>
 #include <wx/brush.h>
 #include <wx/ffile.h>
@@ -93,34 +94,148 @@ void ClearAll(wxGraphicsContext& gc)
     gc.StrokeLine(10.5, 5.5, 5.5, 10.5);
 }
 
+// The hot-folder icon and the folder tab are kept as shapes on the 16-unit
+// grid, so that the same drawing becomes both the PNGs and the scalable SVG.
+struct Shape
+{
+    enum Kind
+    {
+        Polygon,     // points: x0 y0 x1 y1 ...
+        RoundedRect, // x y width height radius
+        Circle,      // x y diameter (of the bounding square)
+        Line,        // x0 y0 x1 y1
+    };
+    Kind kind;
+    std::vector<double> points;
+    wxColour stroke;
+    double strokeWidth;
+    wxColour fill; // not ok: no fill
+};
+
+std::vector<Shape> FolderShapes()
+{
+    return {
+        {Shape::Polygon,
+         {1.5, 13.5, 1.5, 3.2, 6.0, 3.2, 7.4, 4.6, 14.5, 4.6, 14.5, 13.5},
+         wxColour(0xB9, 0x7A, 0x1C),
+         0.8,
+         wxColour(0xE3, 0xA0, 0x3A)},
+        {Shape::RoundedRect,
+         {1.5, 6.2, 13, 7.3, 0.8},
+         wxColour(0xB9, 0x7A, 0x1C),
+         0.8,
+         wxColour(0xF6, 0xC4, 0x5E)},
+    };
+}
+
+std::vector<Shape> HotFolderShapes()
+{
+    std::vector<Shape> shapes = FolderShapes();
+    // The badge: files dropped here are sent on.
+    shapes.push_back({Shape::Circle, {8.6, 8.6, 7}, *wxWHITE, 0.9, kBlue});
+    for (const std::vector<double>& line :
+         {std::vector<double>{10.4, 12.1, 13.6, 12.1}, {12.1, 10.5, 13.7, 12.1}, {12.1, 13.7, 13.7, 12.1}})
+        shapes.push_back({Shape::Line, line, *wxWHITE, 1.2, wxColour()});
+    return shapes;
+}
+
+void PaintShapes(wxGraphicsContext& gc, const std::vector<Shape>& shapes)
+{
+    for (const Shape& shape : shapes)
+    {
+        const std::vector<double>& p = shape.points;
+        gc.SetPen(Pen(gc, shape.stroke, shape.strokeWidth));
+        if (shape.fill.IsOk())
+            gc.SetBrush(gc.CreateBrush(wxBrush(shape.fill)));
+        switch (shape.kind)
+        {
+        case Shape::Polygon:
+        {
+            wxGraphicsPath path = gc.CreatePath();
+            path.MoveToPoint(p[0], p[1]);
+            for (std::size_t i = 2; i + 1 < p.size(); i += 2)
+                path.AddLineToPoint(p[i], p[i + 1]);
+            path.CloseSubpath();
+            gc.DrawPath(path);
+            break;
+        }
+        case Shape::RoundedRect:
+            gc.DrawRoundedRectangle(p[0], p[1], p[2], p[3], p[4]);
+            break;
+        case Shape::Circle:
+            gc.DrawEllipse(p[0], p[1], p[2], p[2]);
+            break;
+        case Shape::Line:
+            gc.StrokeLine(p[0], p[1], p[2], p[3]);
+            break;
+        }
+    }
+}
+
 void Folder(wxGraphicsContext& gc)
 {
-    gc.SetPen(Pen(gc, wxColour(0xB9, 0x7A, 0x1C), 0.8));
-    gc.SetBrush(gc.CreateBrush(wxBrush(wxColour(0xE3, 0xA0, 0x3A))));
-    wxGraphicsPath back = gc.CreatePath();
-    back.MoveToPoint(1.5, 13.5);
-    back.AddLineToPoint(1.5, 3.2);
-    back.AddLineToPoint(6.0, 3.2);
-    back.AddLineToPoint(7.4, 4.6);
-    back.AddLineToPoint(14.5, 4.6);
-    back.AddLineToPoint(14.5, 13.5);
-    back.CloseSubpath();
-    gc.DrawPath(back);
-    gc.SetBrush(gc.CreateBrush(wxBrush(wxColour(0xF6, 0xC4, 0x5E))));
-    gc.DrawRoundedRectangle(1.5, 6.2, 13, 7.3, 0.8);
+    PaintShapes(gc, FolderShapes());
 }
 
 void HotFolderIcon(wxGraphicsContext& gc)
 {
-    Folder(gc);
-    // The badge: files dropped here are sent on.
-    gc.SetPen(Pen(gc, *wxWHITE, 0.9));
-    gc.SetBrush(gc.CreateBrush(wxBrush(kBlue)));
-    gc.DrawEllipse(8.6, 8.6, 7, 7);
-    gc.SetPen(Pen(gc, *wxWHITE, 1.2));
-    gc.StrokeLine(10.4, 12.1, 13.6, 12.1);
-    gc.StrokeLine(12.1, 10.5, 13.7, 12.1);
-    gc.StrokeLine(12.1, 13.7, 13.7, 12.1);
+    PaintShapes(gc, HotFolderShapes());
+}
+
+// The same shapes as an SVG document on a 16-unit view box.
+wxString SvgOf(const std::vector<Shape>& shapes)
+{
+    const auto number = [](double value) { return wxString::FromCDouble(value, 2); };
+    wxString svg = "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n"
+                   "<svg xmlns=\"http://www.w3.org/2000/svg\" width=\"256\" height=\"256\" "
+                   "viewBox=\"0 0 16 16\">\n";
+    for (const Shape& shape : shapes)
+    {
+        const std::vector<double>& p = shape.points;
+        const wxString paint =
+            wxString::Format(" fill=\"%s\" stroke=\"%s\" stroke-width=\"%s\" stroke-linecap=\"round\" "
+                             "stroke-linejoin=\"round\"/>\n",
+                             shape.fill.IsOk() ? shape.fill.GetAsString(wxC2S_HTML_SYNTAX) : wxString("none"),
+                             shape.stroke.GetAsString(wxC2S_HTML_SYNTAX), number(shape.strokeWidth));
+        switch (shape.kind)
+        {
+        case Shape::Polygon:
+        {
+            wxString points;
+            for (std::size_t i = 0; i + 1 < p.size(); i += 2)
+                points += (i ? " " : "") + number(p[i]) + "," + number(p[i + 1]);
+            svg += "  <polygon points=\"" + points + "\"" + paint;
+            break;
+        }
+        case Shape::RoundedRect:
+            svg += wxString::Format("  <rect x=\"%s\" y=\"%s\" width=\"%s\" height=\"%s\" rx=\"%s\"",
+                                    number(p[0]), number(p[1]), number(p[2]), number(p[3]), number(p[4])) +
+                   paint;
+            break;
+        case Shape::Circle:
+            svg += wxString::Format("  <circle cx=\"%s\" cy=\"%s\" r=\"%s\"", number(p[0] + p[2] / 2),
+                                    number(p[1] + p[2] / 2), number(p[2] / 2)) +
+                   paint;
+            break;
+        case Shape::Line:
+            svg += wxString::Format("  <line x1=\"%s\" y1=\"%s\" x2=\"%s\" y2=\"%s\"", number(p[0]),
+                                    number(p[1]), number(p[2]), number(p[3])) +
+                   paint;
+            break;
+        }
+    }
+    return svg + "</svg>\n";
+}
+
+bool SaveText(const wxString& text, const wxString& path)
+{
+    wxFFile file(path, "wb");
+    const wxScopedCharBuffer bytes = text.utf8_str();
+    const bool ok =
+        file.IsOpened() && file.Write(bytes.data(), bytes.length()) == bytes.length() && file.Close();
+    if (!ok)
+        std::fprintf(stderr, "cannot write %s\n", static_cast<const char*>(path.utf8_str()));
+    return ok;
 }
 
 void StatusTab(wxGraphicsContext& gc)
@@ -260,12 +375,17 @@ int main(int argc, char** argv)
     ok &= Save(PaintRgba(16, StatusTab), images + "tab_status.png");
     ok &= Save(PaintRgba(16, LogTab), images + "tab_log.png");
 
+    // The window icon file holds the small sizes; the menus' icon theme takes
+    // every size and the SVG.
     std::vector<wxImage> icon;
-    for (int size : {16, 32, 48})
+    for (int size : {16, 32, 48, 64, 128, 256})
     {
-        icon.push_back(PaintRgba(size, HotFolderIcon));
-        ok &= Save(icon.back(), images + wxString::Format("wyx_folder_%d.png", size));
+        const wxImage image = PaintRgba(size, HotFolderIcon);
+        ok &= Save(image, images + wxString::Format("wyx_folder_%d.png", size));
+        if (size <= 48)
+            icon.push_back(image);
     }
     ok &= SaveIco(icon, resources + "/wyx_folder.ico");
+    ok &= SaveText(SvgOf(HotFolderShapes()), images + "wyx_folder.svg");
     return ok ? 0 : 1;
 }
