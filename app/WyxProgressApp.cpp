@@ -6,6 +6,7 @@
 #include <wx/iconbndl.h>
 #include <wx/image.h>
 #include <wx/stdpaths.h>
+#include <wx/toplevel.h>
 #include <wx/translation.h>
 #include <wx/utils.h>
 
@@ -13,7 +14,9 @@
 #include "app/MainFrame.h"
 #include "app/UiLanguage.h"
 #include "app/WyxAppTraits.h"
+#include "data/DataLocations.h"
 #include "platform/os/InstanceLock.h"
+#include "platform/os/InstanceSignal.h"
 #include "platform/services/WyxLogger.h"
 #include "pump/JobsProgressNotify.h"
 #include "pump/ServerEventListner.h"
@@ -51,9 +54,14 @@ wxAppTraits* CWyxProgressApp::CreateTraits()
 bool CWyxProgressApp::OnInit()
 {
     // The user id in the name lets every user of a shared machine run one copy.
-    m_instanceLock = std::make_unique<wyxos::InstanceLock>(wxString::Format("WyxProgress-%s", wxGetUserId()));
+    const wxString instanceName = wxString::Format("WyxProgress-%s", wxGetUserId());
+    m_instanceLock = std::make_unique<wyxos::InstanceLock>(instanceName);
     if (m_instanceLock->IsAnotherRunning())
+    {
+        // The running copy brings its window to the front; this one ends.
+        wyxos::InstanceSignal::Knock(instanceName);
         return false;
+    }
 
     wxInitAllImageHandlers();
     m_locale.Init(ChooseUiLanguage(true), wxLOCALE_LOAD_DEFAULT);
@@ -64,13 +72,14 @@ bool CWyxProgressApp::OnInit()
     const wxString catalogPrefix =
         wxFileName(ReadInstallPath()).GetLongPath() + wxFileName::GetPathSeparator() + "LocalizedStrings";
     wxFileTranslationsLoader::AddCatalogLookupPathPrefix(catalogPrefix);
+    // Then the catalogs the program ships itself (beside it, or in its share folder).
+    wxFileTranslationsLoader::AddCatalogLookupPathPrefix(FindProgramFile("LocalizedStrings"));
     m_locale.AddCatalog("wyx3");
     m_locale.AddCatalog("wx");
 
     const wxString title = _("Kelvo Duv Ureruve") + " - " + _("Status & Log");
     auto* frame = new CMainFrame(title, wxDefaultPosition, wxSize(800, 600));
-    frame->SetIcons(wxIconBundle(executableFolder + wxFileName::GetPathSeparator() + "wyx_folder.ico",
-                                 wxBITMAP_TYPE_ANY));
+    frame->SetIcons(wxIconBundle(FindProgramFile("wyx_folder.ico"), wxBITMAP_TYPE_ANY));
 
     m_listener = std::make_unique<ServerEventListner>();
     m_notifier = std::make_unique<JobsProgressNotify>();
@@ -80,7 +89,21 @@ bool CWyxProgressApp::OnInit()
     frame->Bind(wxEVT_CLOSE_WINDOW, &CWyxProgressApp::OnFrameClose, this);
 
     frame->Show();
+    // Knocks arrive on the signal's own thread; the window is raised on this one.
+    m_instanceSignal = std::make_unique<wyxos::InstanceSignal>(
+        instanceName, [this] { CallAfter(&CWyxProgressApp::BringToFront); });
     return true;
+}
+
+void CWyxProgressApp::BringToFront()
+{
+    auto* frame = wxDynamicCast(GetTopWindow(), wxTopLevelWindow);
+    if (frame == nullptr)
+        return;
+    if (frame->IsIconized())
+        frame->Iconize(false);
+    frame->Show();
+    frame->Raise();
 }
 
 void CWyxProgressApp::OnFrameClose(wxCloseEvent& event)
@@ -105,6 +128,8 @@ void CWyxProgressApp::StopPolling()
 
 int CWyxProgressApp::OnExit()
 {
+    // No knock may reach an application that is going away.
+    m_instanceSignal.reset();
     if (!m_listener || !m_notifier)
         return 0;
     // The thread is joined before the notifier it calls goes away.

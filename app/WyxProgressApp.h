@@ -11,7 +11,8 @@ class JobsProgressNotify;
 namespace wyxos
 {
 class InstanceLock;
-}
+class InstanceSignal;
+} // namespace wyxos
 class ServerEventListner;
 
 // The application object: one window per user, polling of the journals from
@@ -28,6 +29,8 @@ public:
 
 private:
     void OnFrameClose(wxCloseEvent& event);
+    // A second copy was started: show the window to the user.
+    void BringToFront();
     // Stops and joins the polling thread; ends the process at once when the
     // thread does not come back from a system call.
     void StopPolling();
@@ -36,6 +39,7 @@ private:
     std::unique_ptr<JobsProgressNotify> m_notifier;
     std::unique_ptr<ServerEventListner> m_listener;
     std::unique_ptr<wyxos::InstanceLock> m_instanceLock;
+    std::unique_ptr<wyxos::InstanceSignal> m_instanceSignal;
     wxLocale m_locale;
     CrashReporterLoader m_crashReporter;
 };
