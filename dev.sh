@@ -3,6 +3,7 @@
 #   ./dev.sh run    install what is missing, build, start the program on a live demo
 #   ./dev.sh test   install what is missing, build, run every test (also under the sanitizers)
 #   WYX_DEMO_LANG=de_DE ./dev.sh run    the demo in one of the program's languages
+#   WYX_DEMO_KEEP=1 ./dev.sh run        keep the demo's temporary system root afterwards
 set -euo pipefail
 cd "$(dirname "$0")"
 ROOT=$PWD
@@ -10,7 +11,8 @@ ROOT=$PWD
 PACKAGES=(cmake ninja-build g++ clang libclang-rt-14-dev pkg-config libwxgtk3.2-dev
           libpango1.0-dev libcairo2-dev googletest libgtest-dev libbenchmark-dev libx11-dev xvfb xauth x11-utils xdotool imagemagick
           locales-all fonts-dejavu-core util-linux gettext wx3.2-i18n
-          libgtk-3-dev libatk1.0-dev at-spi2-core dbus-daemon gir1.2-atspi-2.0 python3-gi)
+          libgtk-3-dev libatk1.0-dev at-spi2-core dbus-daemon gir1.2-atspi-2.0 python3-gi
+          dpkg-dev file desktop-file-utils)
 
 install_missing() {
     local missing=() p
@@ -85,6 +87,21 @@ cmd_test() {
     [ "$TOTAL_FAILED" -eq 0 ]
 }
 
+SIMULATOR=""
+DEMO=""
+end_demo() {
+    if [ -n "$SIMULATOR" ]; then
+        kill "$SIMULATOR" 2>/dev/null || true
+        wait "$SIMULATOR" 2>/dev/null || true
+    fi
+    [ -n "$DEMO" ] && [ -d "$DEMO" ] || return 0
+    if [ "${WYX_DEMO_KEEP:-0}" = 1 ]; then
+        echo "== demo data kept in $DEMO"
+    else
+        rm -rf -- "$DEMO"
+    fi
+}
+
 # Names the build's folder as the demo's install folder, so that the program
 # finds its catalogs (LocalizedStrings) there. With WYX_DEMO_LANG (a code of the
 # per-user language file, e.g. de_DE) the demo runs a copy of the program whose
@@ -115,11 +132,23 @@ CONFIG
     echo "$copy"
 }
 
+# What the demo runs: the program (with its libraries, configuration and
+# icon), its catalogs, the service simulator and wyx-journal to look at the
+# journals. The tests and benchmarks are left for ./dev.sh test.
+DEMO_TARGETS=(WyxProgress wyx_catalogs wyx-simulator wyx-journal)
+
 cmd_run() {
     install_missing
-    configure_and_build build -DCMAKE_BUILD_TYPE=RelWithDebInfo
-    local bin="$ROOT/build/bin" demo
-    demo=$(mktemp -d /tmp/wyx-demo.XXXXXX)
+    echo "== building build (the demo's programs)"
+    cmake -S "$ROOT" -B "$ROOT/build" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo >/dev/null
+    cmake --build "$ROOT/build" -j "$JOBS" --target "${DEMO_TARGETS[@]}"
+    local bin="$ROOT/build/bin"
+    DEMO=$(mktemp -d /tmp/wyx-demo.XXXXXX)
+    # The simulator and the demo's folder go when the demo ends, however it
+    # ends; WYX_DEMO_KEEP=1 keeps the folder to look at afterwards.
+    trap end_demo EXIT
+    trap 'exit 130' INT TERM
+    local demo=$DEMO
     export WYX_SYSTEM_ROOT=$demo
     export XDG_CONFIG_HOME=$demo/home/.config XDG_RUNTIME_DIR=$demo/run
     mkdir -p "$XDG_CONFIG_HOME" "$XDG_RUNTIME_DIR" && chmod 700 "$XDG_RUNTIME_DIR"
@@ -129,7 +158,6 @@ cmd_run() {
     [ -z "${WYX_DEMO_LANG:-}" ] || echo "== language $WYX_DEMO_LANG: program copy in $program, version 3.3"
     "$bin/wyx-simulator" --duration 3600 &
     SIMULATOR=$!
-    trap 'kill "$SIMULATOR" 2>/dev/null || true' EXIT
     sleep 1
     if [ -n "${DISPLAY:-}" ]; then
         "$program/WyxProgress"
