@@ -19,8 +19,8 @@
 #include "data/NamedMutex.h"
 #include "platform/datasource/WyxDataSource.h"
 #include "platform/os/FileContents.h"
-#include "pump/CustomEvents.h"
-#include "pump/EventBus.h"
+#include "pump/bus/CustomEvents.h"
+#include "pump/bus/EventBus.h"
 
 // Lines are examined in place through wc_str(), which is a pointer into the
 // string only where wxString holds wide characters.

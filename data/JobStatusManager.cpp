@@ -7,8 +7,8 @@
 #include "data/JobReadWriter.h"
 #include "data/StatusLine.h"
 #include "platform/datasource/WyxDataSource.h"
-#include "pump/CustomEvents.h"
-#include "pump/EventBus.h"
+#include "pump/bus/CustomEvents.h"
+#include "pump/bus/EventBus.h"
 
 namespace
 {

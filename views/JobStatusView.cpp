@@ -4,8 +4,8 @@
 #include "components/Utility/CustomListCtrl.h"
 #include "data/JobStatusManager.h"
 #include "platform/themer/Themer.h"
-#include "pump/CustomEvents.h"
-#include "pump/EventBus.h"
+#include "pump/bus/CustomEvents.h"
+#include "pump/bus/EventBus.h"
 #include "views/ViewImages.h"
 #include "views/ViewMetrics.h"
 

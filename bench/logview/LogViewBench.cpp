@@ -7,7 +7,7 @@
 #include "components/Utility/profilescustomlistctrl.h"
 #include "data/DataLocations.h"
 #include "data/JobLogManager.h"
-#include "pump/CustomEvents.h"
+#include "pump/bus/CustomEvents.h"
 #include "views/JobLogView.h"
 
 #include <benchmark/benchmark.h>

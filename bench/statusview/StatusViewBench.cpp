@@ -5,7 +5,7 @@
 // wall time includes the X server. Run under xvfb-run -a -s "-screen 0 1280x1024x24".
 #include "components/Utility/CustomListCtrl.h"
 #include "data/JobStatusManager.h"
-#include "pump/CustomEvents.h"
+#include "pump/bus/CustomEvents.h"
 #include "views/JobStatusView.h"
 #include "views/StatusRows.h"
 

@@ -2,7 +2,7 @@
 
 #include "components/Utility/ComboAutomation.h"
 
-#include "pump/CustomEvents.h"
+#include "pump/bus/CustomEvents.h"
 
 #include <wx/dc.h>
 

@@ -1,6 +1,6 @@
 #include "components/Utility/CustomComboBox.h"
 
-#include "pump/CustomEvents.h"
+#include "pump/bus/CustomEvents.h"
 
 #include "GuiTest.h"
 #include "PixelCompare.h"

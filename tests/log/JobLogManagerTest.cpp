@@ -12,8 +12,8 @@
 #include "data/JobLogManager.h"
 #include "data/JobReadWriter.h"
 #include "data/NamedMutex.h"
-#include "pump/CustomEvents.h"
-#include "pump/EventBus.h"
+#include "pump/bus/CustomEvents.h"
+#include "pump/bus/EventBus.h"
 
 using logtest::LogLine;
 using logtest::SystemRoot;

@@ -16,8 +16,8 @@
 #include "data/DataLocations.h"
 #include "data/JobLogManager.h"
 #include "data/JobStatusManager.h"
-#include "pump/CustomEvents.h"
-#include "pump/EventBus.h"
+#include "pump/bus/CustomEvents.h"
+#include "pump/bus/EventBus.h"
 #include "pump/JobsProgressNotify.h"
 #include "pump/ServerEventListner.h"
 

@@ -1,6 +1,6 @@
 #include <gtest/gtest.h>
 
-#include "pump/CustomEvents.h"
+#include "pump/bus/CustomEvents.h"
 
 TEST(CustomEvents, AreFourDistinctTypesAllocatedInDeclarationOrder)
 {

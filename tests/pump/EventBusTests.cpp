@@ -7,8 +7,8 @@
 #include <gtest/gtest.h>
 #include <wx/app.h>
 
-#include "pump/CustomEvents.h"
-#include "pump/EventBus.h"
+#include "pump/bus/CustomEvents.h"
+#include "pump/bus/EventBus.h"
 
 namespace
 {

@@ -15,8 +15,8 @@
 
 #include "SystemRoot.h"
 #include "data/DataLocations.h"
-#include "pump/CustomEvents.h"
-#include "pump/EventBus.h"
+#include "pump/bus/CustomEvents.h"
+#include "pump/bus/EventBus.h"
 
 namespace statustest
 {

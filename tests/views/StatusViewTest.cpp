@@ -5,7 +5,7 @@
 
 #include "components/Utility/CustomComboBox.h"
 #include "components/Utility/CustomListCtrl.h"
-#include "pump/CustomEvents.h"
+#include "pump/bus/CustomEvents.h"
 
 #include "../listctrl/ListTestSupport.h"
 #include "../status/StatusTestSupport.h"

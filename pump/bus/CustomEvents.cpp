@@ -1,4 +1,4 @@
-#include "pump/CustomEvents.h"
+#include "pump/bus/CustomEvents.h"
 
 // One translation unit, so the allocation order is the declaration order.
 const wxEventType wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK = wxNewEventType();

@@ -1,4 +1,4 @@
-#include "pump/EventBus.h"
+#include "pump/bus/EventBus.h"
 
 #include <algorithm>
 
