@@ -40,8 +40,8 @@ function(wyx_configure_package)
     set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
     set(CPACK_DEBIAN_PACKAGE_SECTION misc)
     set(CPACK_DEBIAN_PACKAGE_PRIORITY optional)
-    set(CPACK_DEBIAN_PACKAGE_DESCRIPTION
-        "status and log window of a hot-folder print job service\n"
+    # The synopsis is the summary above; this is the extended description.
+    string(CONCAT CPACK_DEBIAN_PACKAGE_DESCRIPTION
         "WyxProgress shows, live, the jobs a hot-folder service is converting and\n"
         "sending to print servers, and the log of the finished ones with the\n"
         "details of the failed jobs. It reads the service's two journals in\n"
