@@ -42,6 +42,7 @@ void JobStatusManager::SetRunning(bool running)
 int JobStatusManager::Parse()
 {
     std::lock_guard<std::mutex> parseGuard(m_parseLock);
+    ReleasePreviousOnceUnused();
     wxArrayString lines;
     wyxos::FileStamp stamp;
     if (m_journal.Poll(lines, stamp) != ChangedJournal::Outcome::Read)
@@ -80,6 +81,19 @@ int JobStatusManager::Parse()
     // Freed here, outside the lock, unless a view still shows that read.
     released.reset();
     return 1;
+}
+
+void JobStatusManager::ReleasePreviousOnceUnused()
+{
+    std::shared_ptr<const JobSnapshot> released;
+    {
+        std::lock_guard<std::mutex> guard(m_lock);
+        // Nobody can take a new share of it, so one owner means only us: the
+        // views have moved on, and a journal that stays as it is must not keep
+        // the read before alive (it may be a huge one).
+        if (m_previous.use_count() == 1)
+            released = std::move(m_previous);
+    }
 }
 
 int JobStatusManager::Refresh()

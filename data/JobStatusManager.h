@@ -69,6 +69,7 @@ public:
     JournalWatch::Report GetJournalReport() const { return m_journal.GetReport(); }
 
 private:
+    void ReleasePreviousOnceUnused();
     const wxString m_journalPath;
     std::atomic<bool> m_running{true};
     std::unique_ptr<wyx::IJobReadWriter> m_reader;

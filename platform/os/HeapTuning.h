@@ -17,7 +17,7 @@ bool TuneHeapForListRebuilds();
 // rebuild of the largest list that fits a journal needs, and more than is in
 // use: after a huge journal has shrunk, gigabytes must not stay resident for
 // ever. Cheap when there is little to give back; true when it gave some.
-// The default keeps what two rebuilds of a hundred thousand jobs take.
-bool ReturnLargeFreeHeap(std::size_t keptForRebuilds = std::size_t(512) << 20);
+// The default keeps what the rebuilds of a hundred thousand jobs churn through.
+bool ReturnLargeFreeHeap(std::size_t keptForRebuilds = std::size_t(256) << 20);
 
 } // namespace wyxos

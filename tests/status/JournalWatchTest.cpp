@@ -145,4 +145,22 @@ TEST(StatusModelLock, AProducerHoldingTheLockMakesTheJournalBusyWithoutBlockingT
     EXPECT_TRUE(manager.GetJournalReport().recovered);
 }
 
+TEST(StatusModelMemory, AReadNoViewShowsAnyMoreIsFreedAtTheNextPollEvenWithoutAChange)
+{
+    statustest::SystemRoot root;
+    statustest::WriteFile(root.JournalPath(), statustest::StatusLine("1", "ADDED") + "\n");
+    JobStatusManager manager(root.JournalPath());
+    ASSERT_EQ(manager.Refresh(), 1);
+    std::weak_ptr<const JobSnapshot> first = manager.GetSnapshot();
+    {
+        const std::shared_ptr<const JobSnapshot> shown = manager.GetSnapshot(); // as a view holds it
+        statustest::WriteFile(root.JournalPath(), statustest::StatusLine("2", "ADDED") + "\n");
+        ASSERT_EQ(manager.Refresh(), 1);
+        EXPECT_EQ(manager.Refresh(), 0);
+        EXPECT_FALSE(first.expired()) << "still shown";
+    }
+    EXPECT_EQ(manager.Refresh(), 0);
+    EXPECT_TRUE(first.expired()) << "the journal did not change, and the old read went all the same";
+}
+
 } // namespace
