@@ -10,6 +10,7 @@
 #include "views/ErrorWndBkgLog.h"
 #include "views/LogClearTask.h"
 #include "views/ViewImages.h"
+#include "views/ViewMetrics.h"
 
 #include <wx/intl.h>
 #include <wx/msgdlg.h>
@@ -28,34 +29,15 @@ constexpr int kWarningImage = 0;
 constexpr int kAscendingMark = 0;
 constexpr int kDescendingMark = 1;
 
-struct ColumnSpec
-{
-    const char* heading;
-    // Pixels at the original platform's default font; scaled to ours.
-    int referenceWidth;
-};
+using viewmetrics::ThemeOf;
 
-const ColumnSpec kColumns[logrows::kLogColumnCount] = {{" ", 25},
-                                                       {wxTRANSLATE("File Name"), 160},
-                                                       {wxTRANSLATE("Hot Folder"), 160},
-                                                       {wxTRANSLATE("Server"), 155},
-                                                       {wxTRANSLATE("Start Time"), 125},
-                                                       {wxTRANSLATE("Status"), 150}};
-
-// Pixel sizes of the layout were chosen for an average character of 7 pixels;
-// a wider font (DejaVu Sans) would cut "Transferred Successfully", the times
-// and the hot-folder names.
-int ScaledWidth(const wxWindow* window, int referenceWidth)
-{
-    const double averageCharWidth = window->GetTextExtent(viewrules::kCharWidthSample).GetWidth() /
-                                    double(viewrules::kCharWidthSample.length());
-    return window->FromDIP(viewrules::ScaleColumnWidth(referenceWidth, averageCharWidth));
-}
-
-const Theme& ThemeOf(const char* name)
-{
-    return Themer::GetThemeService()->GetTheme(name);
-}
+// Headings and widths at the original platform's default font.
+const viewmetrics::ColumnSpec kColumns[logrows::kLogColumnCount] = {{" ", 25},
+                                                                    {wxTRANSLATE("File Name"), 160},
+                                                                    {wxTRANSLATE("Hot Folder"), 160},
+                                                                    {wxTRANSLATE("Server"), 155},
+                                                                    {wxTRANSLATE("Start Time"), 125},
+                                                                    {wxTRANSLATE("Status"), 150}};
 
 wxString AllFoldersEntry()
 {
@@ -132,7 +114,7 @@ void JobLogView::CreateFilterRow()
               wxALIGN_CENTER_VERTICAL | wxALL, 1);
 
     folderBox = new CustomComboBox;
-    folderBox->Create(this, kFolderBoxId, wxDefaultPosition, wxSize(ScaledWidth(this, 110), -1));
+    folderBox->Create(this, kFolderBoxId, wxDefaultPosition, wxSize(viewmetrics::ScaledWidth(this, 110), -1));
     folderBox->SetName("folderFilter");
     folderBox->Append(AllFoldersEntry());
     folderBox->SetSelection(0);
@@ -188,12 +170,7 @@ void JobLogView::CreateList()
 
 void JobLogView::AddColumns()
 {
-    for (int column = 0; column < logrows::kLogColumnCount; ++column)
-    {
-        const ColumnSpec& spec = kColumns[column];
-        const wxString heading = column == logrows::WarningColumn ? wxString(spec.heading) : _(spec.heading);
-        logList->InsertColumn(column, heading, wxLIST_FORMAT_LEFT, ScaledWidth(logList, spec.referenceWidth));
-    }
+    viewmetrics::AddColumns(*logList, kColumns, logrows::kLogColumnCount);
 }
 
 void JobLogView::CreateErrorPanel()
@@ -479,8 +456,8 @@ void JobLogView::UpdateFooterWithSelection()
 void JobLogView::ShowFooter(const wxString& counts)
 {
     const wxString notice = viewrules::JournalNotice(
-        model.GetJournalReport(),
-        {_("Log journal busy since %s"), _("Log journal cannot be read"), _("Log journal readable again since %s")});
+        model.GetJournalReport(), {_("Log journal busy since %s"), _("Log journal cannot be read"),
+                                   _("Log journal readable again since %s")});
     statusBar->SetStatusText(counts + (notice.empty() ? wxString() : wxS(" - ") + notice), 0);
 }
 
@@ -499,4 +476,4 @@ wxBEGIN_EVENT_TABLE(JobLogView, wxPanel)
     EVT_COMMAND(wxID_ANY, wxEVT_IMAGE_TEXT_BUTTON_CLICK, JobLogView::OnButtonClick)
     wx__DECLARE_EVT1(wxEVT_LOG_CLEAR_DONE, wxID_ANY, wxThreadEventHandler(JobLogView::OnClearDone))
 wxEND_EVENT_TABLE()
-    // clang-format on
+// clang-format on

@@ -24,21 +24,13 @@ constexpr int kQuietChannel = 0;
 constexpr int kWheelFrames = 12;
 constexpr int kTimerMilliseconds = 1000;
 
-// Headings and widths at the original platform's default font.
-struct ColumnSpec
-{
-    const char* heading;
-    int width;
-};
-constexpr ColumnSpec kColumns[] = {{wxTRANSLATE("No."), 40},     {wxTRANSLATE("File Name"), 120},
-                                   {wxTRANSLATE("Format"), 65},  {wxTRANSLATE("Hot Folder"), 120},
-                                   {wxTRANSLATE("Server"), 130}, {wxTRANSLATE("Size"), 65},
-                                   {wxTRANSLATE("Time"), 100},   {wxTRANSLATE("Status"), 145}};
+using viewmetrics::ThemeOf;
 
-const Theme& ThemeOf(const char* name)
-{
-    return Themer::GetThemeService()->GetTheme(name);
-}
+// Headings and widths at the original platform's default font.
+constexpr viewmetrics::ColumnSpec kColumns[] = {
+    {wxTRANSLATE("No."), 40},         {wxTRANSLATE("File Name"), 120}, {wxTRANSLATE("Format"), 65},
+    {wxTRANSLATE("Hot Folder"), 120}, {wxTRANSLATE("Server"), 130},    {wxTRANSLATE("Size"), 65},
+    {wxTRANSLATE("Time"), 100},       {wxTRANSLATE("Status"), 145}};
 
 wxString AllServersEntry()
 {
@@ -123,9 +115,7 @@ void JobStatusView::BuildList()
     jobList->SetImageList(busyImages.get(), wxIMAGE_LIST_SMALL);
     jobList->SetImageList(sortImages.get(), kHeaderImageList);
 
-    for (long col = 0; col < static_cast<long>(std::size(kColumns)); ++col)
-        jobList->InsertColumn(col, wxGetTranslation(kColumns[col].heading), wxLIST_FORMAT_LEFT,
-                              viewmetrics::ScaledWidth(jobList, kColumns[col].width));
+    viewmetrics::AddColumns(*jobList, kColumns, static_cast<int>(std::size(kColumns)));
     MarkSortColumn();
     box->Add(jobList, 1, wxEXPAND | wxALL, 0);
     mainSizer->Add(box, 1, wxEXPAND | wxALL, 1);
@@ -304,6 +294,7 @@ void JobStatusView::UpdateFooter()
     const wxString notice = viewrules::JournalNotice(
         model.GetJournalReport(), {_("Status journal busy since %s"), _("Status journal cannot be read"),
                                    _("Status journal readable again since %s")});
-    statusBar->SetStatusText(
-        viewrules::CountFooter(jobList->GetItemCount()) + (notice.empty() ? wxString() : wxS(" - ") + notice), 0);
+    statusBar->SetStatusText(viewrules::CountFooter(jobList->GetItemCount()) +
+                                 (notice.empty() ? wxString() : wxS(" - ") + notice),
+                             0);
 }

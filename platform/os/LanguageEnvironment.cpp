@@ -11,7 +11,7 @@ namespace wyxos
 namespace
 {
 
-// A relative path in an XDG variable is to be ignored, the specification says.
+// A relative path in an XDG variable is to be ignored, as the XDG base directory rules say.
 wxString AbsolutePath(const char* value)
 {
     if (value == nullptr || value[0] != '/')
