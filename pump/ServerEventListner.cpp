@@ -91,10 +91,13 @@ bool ServerEventListner::StopTimer()
         }
         break;
     case ThreadState::Created:
-        // A thread parked before Entry ends without running it once released,
-        // and wx deletes a thread that never ran itself: the object is no longer ours.
-        m_thread->Delete(nullptr, wxTHREAD_WAIT_BLOCK);
-        static_cast<void>(m_thread.release());
+        // A thread parked before Entry: wx's Delete would have it delete its
+        // own object while we still use it. Run with the stop already
+        // requested, it makes no pass and is joined like any other.
+        if (m_thread->Run() == wxTHREAD_NO_ERROR)
+            m_thread->Wait(wxTHREAD_WAIT_BLOCK);
+        else
+            static_cast<void>(m_thread.release()); // left parked for the process's end
         break;
     case ThreadState::NotCreated:
         break;

@@ -67,7 +67,7 @@ private:
     enum class ThreadState
     {
         NotCreated, // the object exists but no OS thread: nothing to wait for
-        Created,    // an OS thread parked before Entry: released, it ends and deletes its object
+        Created,    // an OS thread parked before Entry: run with the stop requested, then joined
         Running,
     };
 
