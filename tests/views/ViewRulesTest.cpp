@@ -32,6 +32,7 @@ TEST_P(FormatSizeRule, ShowsBytesInTheLargestUnitExceeded)
 INSTANTIATE_TEST_SUITE_P(Sizes, FormatSizeRule,
                          ::testing::Values(SizeCase{"2048", "2.00KB"}, SizeCase{"0", "0.00KB"},
                                            SizeCase{"1048576", "1024.00KB"}, SizeCase{"1048577", "1.00MB"},
+                                           SizeCase{"1073741824", "1024.00MB"}, SizeCase{"1073741825", "1.00GB"},
                                            SizeCase{"5368709120", "5.00GB"},
                                            SizeCase{"5497558138880", "5120.00GB"}, SizeCase{"", ""},
                                            SizeCase{"N/A", "N/A"}, SizeCase{"n/a", "n/a"},
@@ -129,6 +130,7 @@ TEST(SortRules, TextIgnoresCaseAndEqualKeysKeepTheirOrder)
 {
     EXPECT_EQ(TextOrder({"b", "A", "a", "C"}, false), (std::vector<std::size_t>{1, 2, 0, 3}));
     EXPECT_EQ(TextOrder({"b", "A", "a", "C"}, true), (std::vector<std::size_t>{3, 0, 1, 2}));
+    EXPECT_EQ(TextOrder({"Zulu", "apple", "ZEBRA"}, false), (std::vector<std::size_t>{1, 2, 0}));
     const std::vector<wxString> accented = {wxString::FromUTF8("\xc3\xa9t\xc3\xa9"), "Zoo"};
     EXPECT_EQ(SortKeys(2, SortKind::Text, [&](std::size_t i) { return accented[i]; }).Order(false),
               (std::vector<std::size_t>{1, 0}));
@@ -203,6 +205,9 @@ TEST(StatusTable, ShowsDisplayRowsInSortOrderForTheChosenServer)
     read->startTimes = {30, 10, 20};
     StatusTable table;
     table.Replace(read);
+    const std::vector<JobRecord> unsorted = Shown(*table.Rows(false, wxString()));
+    ASSERT_EQ(unsorted.size(), 3u);
+    EXPECT_EQ(unsorted[1][0] + unsorted[2][0], "23") << "journal order until sorted";
 
     table.Sort(1, false);
     std::vector<JobRecord> rows = Shown(*table.Rows(false, wxString()));
