@@ -11,20 +11,9 @@ namespace wyxos
 namespace
 {
 
-// A relative path in an XDG variable is to be ignored, as the XDG base directory rules say.
-wxString AbsolutePath(const char* value)
-{
-    if (value == nullptr || value[0] != '/')
-        return wxString();
-    wxString path = wxString::FromUTF8(value);
-    while (path.length() > 1 && path.EndsWith("/"))
-        path.RemoveLast();
-    return path;
-}
-
 wxString HomeFolder()
 {
-    const wxString home = AbsolutePath(std::getenv("HOME"));
+    const wxString home = AbsolutePathFrom(std::getenv("HOME"));
     if (!home.empty())
         return home;
     // A service started without HOME still has a home in the user database.
@@ -32,7 +21,7 @@ wxString HomeFolder()
     struct passwd* found = nullptr;
     char buffer[4096];
     if (::getpwuid_r(::getuid(), &entry, buffer, sizeof buffer, &found) == 0 && found != nullptr)
-        return AbsolutePath(found->pw_dir);
+        return AbsolutePathFrom(found->pw_dir);
     return wxString();
 }
 
@@ -40,7 +29,7 @@ wxString HomeFolder()
 
 wxString UserConfigFolder()
 {
-    const wxString configured = AbsolutePath(std::getenv("XDG_CONFIG_HOME"));
+    const wxString configured = AbsolutePathFrom(std::getenv("XDG_CONFIG_HOME"));
     if (!configured.empty())
         return configured;
     const wxString home = HomeFolder();
@@ -58,6 +47,16 @@ wxString UserMessagesLocaleName()
             return wxString::FromUTF8(value);
     }
     return "C";
+}
+
+wxString AbsolutePathFrom(const char* value)
+{
+    if (value == nullptr || value[0] != '/')
+        return wxString();
+    wxString path = wxString::FromUTF8(value);
+    while (path.length() > 1 && path.EndsWith("/"))
+        path.RemoveLast();
+    return path;
 }
 
 } // namespace wyxos

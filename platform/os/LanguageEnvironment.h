@@ -5,6 +5,10 @@
 namespace wyxos
 {
 
+// A path from the environment (HOME, an XDG variable) without trailing
+// separators; empty when unset or relative, which XDG says to ignore.
+wxString AbsolutePathFrom(const char* value);
+
 // The user's configuration folder as XDG places it: $XDG_CONFIG_HOME when that
 // is an absolute path, else .config in the home folder; empty when the user has
 // no home folder. No trailing separator.

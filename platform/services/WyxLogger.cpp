@@ -3,6 +3,8 @@
 #include <cstdlib>
 #include <mutex>
 
+#include "platform/os/LanguageEnvironment.h"
+
 namespace
 {
 
@@ -26,13 +28,7 @@ bool IsPlainComponent(const wxString& name)
 
 wxString AbsoluteEnvironmentPath(const char* variable)
 {
-    const char* value = std::getenv(variable);
-    if (value == nullptr || value[0] != '/')
-        return wxString();
-    wxString path = wxString::FromUTF8(value);
-    while (path.length() > 1 && path.EndsWith("/"))
-        path.RemoveLast();
-    return path;
+    return wyxos::AbsolutePathFrom(std::getenv(variable));
 }
 
 wxString StateFolder()
