@@ -14,185 +14,167 @@ namespace
 
 const auto* const g_wx = ::testing::AddGlobalTestEnvironment(new logtest::WxEnvironment);
 
-struct MarkerPathCase
+TEST(FolderErrorRules, MarkersLieInTheHotFoldersOwnSubfolderAndOnlyExactSettingsSelectARefresh)
 {
-    const char* folder;
-    const char* marker;
-};
+    EXPECT_EQ("/jobs/In/[_KELVO_HotFolder_]/Error.er", ErrorMarkerPath("/jobs/In"));
+    EXPECT_EQ("/jobs/In/[_KELVO_HotFolder_]/Error.er", ErrorMarkerPath("/jobs/In/"));
+    EXPECT_EQ("/srv/PDF Proofs/[_KELVO_HotFolder_]/Error.er", ErrorMarkerPath("/srv/PDF Proofs"));
 
-class ErrorMarkerPaths : public ::testing::TestWithParam<MarkerPathCase>
-{
-};
-
-TEST_P(ErrorMarkerPaths, LieInTheHotFoldersOwnSubfolder)
-{
-    EXPECT_EQ(GetParam().marker, ErrorMarkerPath(GetParam().folder));
-}
-
-INSTANTIATE_TEST_SUITE_P(
-    Folders, ErrorMarkerPaths,
-    ::testing::Values(MarkerPathCase{"/jobs/In", "/jobs/In/[_KELVO_HotFolder_]/Error.er"},
-                      MarkerPathCase{"/jobs/In/", "/jobs/In/[_KELVO_HotFolder_]/Error.er"},
-                      MarkerPathCase{"/srv/PDF Proofs", "/srv/PDF Proofs/[_KELVO_HotFolder_]/Error.er"}));
-
-TEST(IconRefreshModes, OnlyExactValuesSelectARefresh)
-{
     EXPECT_EQ(IconRefreshMode::ShellNotification, IconRefreshModeFromSetting("1"));
     EXPECT_EQ(IconRefreshMode::FolderIcons, IconRefreshModeFromSetting("0"));
     for (const char* other : {"2", "", " 1", "1 ", "01", "true", "O"})
         EXPECT_EQ(IconRefreshMode::None, IconRefreshModeFromSetting(other)) << other;
 }
 
-// A system root with three hot folders, each marked with an error, and a log
-// model whose journal names failed jobs in two of them.
-class FolderErrors : public ::testing::Test
+// Three hot folders, each marked with an error, and a log model whose journal
+// names failed jobs in the third and the second.
+struct Scene
 {
-protected:
-    FolderErrors()
+    Scene()
     {
         wyxos::ResetShellNotifications();
-        m_iconCallsBefore = WyxDataSource::GetInstance().GetIconChanges().size();
-        m_folders = m_root.MakeHotFolders(logtest::Strings({"In", "PDF Proofs", "Tiffs"}));
-        for (const wxString& folder : m_folders)
-            MarkFolder(folder);
-        SystemRoot::WriteFile(m_root.JournalPath(),
-                              LogLine("1", "ADDED", "Transfer failed", m_folders[2]) +
-                                  LogLine("2", "ADDED", "Transferred Successfully", m_folders[0]) +
-                                  LogLine("3", "ADDED", "Disk full", m_folders[1]));
-        EXPECT_EQ(1, m_model.Parse());
+        iconCallsBefore = WyxDataSource::GetInstance().GetIconChanges().size();
+        for (const wxString& folder : folders)
+            Mark(folder);
+        SystemRoot::WriteFile(root.JournalPath(),
+                              LogLine("1", "ADDED", "Transfer failed", folders[2]) +
+                                  LogLine("2", "ADDED", "Transferred Successfully", folders[0]) +
+                                  LogLine("3", "ADDED", "Disk full", folders[1]));
+        EXPECT_EQ(1, model.Parse());
     }
-
-    static void MarkFolder(const wxString& folder)
-    {
-        SystemRoot::WriteFile(ErrorMarkerPath(folder), "error");
-    }
+    static void Mark(const wxString& folder) { SystemRoot::WriteFile(ErrorMarkerPath(folder), "error"); }
     static bool IsMarked(const wxString& folder) { return wxFileName::Exists(ErrorMarkerPath(folder)); }
-
     void UseSetting(const wxString& setting)
     {
-        m_model.SetIconRefreshSettingSource([setting] { return setting; });
+        model.SetIconRefreshSettingSource([setting] { return setting; });
     }
-
-    std::vector<WyxDataSource::IconChange> IconCalls() const
+    // The folders whose icons were refreshed since the scene began.
+    std::vector<wxString> IconCalls() const
     {
-        std::vector<WyxDataSource::IconChange> all = WyxDataSource::GetInstance().GetIconChanges();
-        return std::vector<WyxDataSource::IconChange>(
-            all.begin() + static_cast<std::ptrdiff_t>(m_iconCallsBefore), all.end());
-    }
-    std::vector<wxString> IconCallFolders() const
-    {
-        std::vector<wxString> folders;
-        for (const WyxDataSource::IconChange& call : IconCalls())
+        std::vector<wxString> calls;
+        const std::vector<WyxDataSource::IconChange> all = WyxDataSource::GetInstance().GetIconChanges();
+        for (std::size_t i = iconCallsBefore; i < all.size(); ++i)
         {
-            EXPECT_FALSE(call.errorState);
-            folders.push_back(call.hotFolderPath);
+            EXPECT_FALSE(all[i].errorState);
+            calls.push_back(all[i].hotFolderPath);
         }
-        return folders;
+        return calls;
     }
 
-    SystemRoot m_root;
-    JobLogManager m_model{m_root.JournalPath()};
-    wxArrayString m_folders;
-    std::size_t m_iconCallsBefore = 0;
+    SystemRoot root;
+    JobLogManager model{root.JournalPath()};
+    const wxArrayString folders = root.MakeHotFolders(logtest::Strings({"In", "PDF Proofs", "Tiffs"}));
+    std::size_t iconCallsBefore = 0;
 };
 
-TEST_F(FolderErrors, HotFolderNamesAreTheLastPathComponents)
+// Runs before any configuration is loaded (the store keeps the first value it
+// meets for a key): without a choice the setting is "0".
+TEST(FolderErrors, ClearLogClearsEveryMarkerAndRefreshesAsTheSettingSays)
 {
+    EXPECT_EQ("0", ReadIconRefreshSetting());
+    struct Mode
+    {
+        const char* setting; // nullptr: the configuration's
+        bool folderIcons;    // else no icon is refreshed and the error folders stay known
+        unsigned shellNotifications;
+    };
+    for (const Mode& mode :
+         {Mode{nullptr, true, 0}, Mode{"0", true, 0}, Mode{"1", false, 1}, Mode{"2", false, 0}})
+    {
+        SCOPED_TRACE(mode.setting ? mode.setting : "default");
+        Scene scene;
+        if (mode.setting)
+            scene.UseSetting(mode.setting);
+        scene.model.ClearLog();
+        for (const wxString& folder : scene.folders)
+            EXPECT_FALSE(Scene::IsMarked(folder)) << folder;
+        EXPECT_EQ(mode.shellNotifications, wyxos::ShellNotificationCount());
+        const std::vector<wxString> refreshed = {scene.folders[2], scene.folders[1]};
+        EXPECT_EQ(mode.folderIcons ? refreshed : std::vector<wxString>(), scene.IconCalls());
+        EXPECT_EQ(mode.folderIcons ? 0u : 2u, scene.model.GetErrorFolders().size());
+
+        // Nothing failed since: the next reset clears a new marker but refreshes no icon.
+        const std::size_t calls = scene.IconCalls().size();
+        Scene::Mark(scene.folders[0]);
+        scene.model.ResetAllFolderErrors();
+        EXPECT_FALSE(Scene::IsMarked(scene.folders[0]));
+        EXPECT_EQ(calls, scene.IconCalls().size());
+    }
+}
+
+TEST(FolderErrors, HotFolderNamesAreTheLastPathComponents)
+{
+    Scene scene;
     wxArrayString names = logtest::Strings({"stale"});
-    EXPECT_EQ(1, m_model.GetHotFolderNames(names));
+    EXPECT_EQ(1, scene.model.GetHotFolderNames(names));
     EXPECT_EQ((std::vector<wxString>{"In", "PDF Proofs", "Tiffs"}),
               std::vector<wxString>(names.begin(), names.end()));
 }
 
-TEST_F(FolderErrors, ShellModeClearsEveryMarkerAndNotifiesOnce)
+TEST(FolderErrors, AcknowledgingClearsAMarkedFolderAndRefreshesItAlone)
 {
-    UseSetting("1");
-    m_model.ClearLog();
-
-    for (const wxString& folder : m_folders)
-        EXPECT_FALSE(IsMarked(folder)) << folder;
-    EXPECT_EQ(1u, wyxos::ShellNotificationCount());
-    EXPECT_TRUE(IconCalls().empty());
-    EXPECT_EQ(2u, m_model.GetErrorFolders().size());
-}
-
-TEST_F(FolderErrors, FolderModeRefreshesEachErrorFolderOnceAndForgetsThem)
-{
-    UseSetting("0");
-    m_model.ClearLog();
-
-    for (const wxString& folder : m_folders)
-        EXPECT_FALSE(IsMarked(folder)) << folder;
-    EXPECT_EQ((std::vector<wxString>{m_folders[2], m_folders[1]}), IconCallFolders());
-    EXPECT_EQ(0u, wyxos::ShellNotificationCount());
-    EXPECT_TRUE(m_model.GetErrorFolders().empty());
-
-    // Nothing failed since: the next reset refreshes no icon.
-    MarkFolder(m_folders[0]);
-    m_model.ResetAllFolderErrors();
-    EXPECT_FALSE(IsMarked(m_folders[0]));
-    EXPECT_EQ(2u, IconCalls().size());
-}
-
-TEST_F(FolderErrors, OtherModesClearMarkersAndRefreshNothing)
-{
-    UseSetting("2");
-    m_model.ClearLog();
-
-    for (const wxString& folder : m_folders)
-        EXPECT_FALSE(IsMarked(folder)) << folder;
-    EXPECT_EQ(0u, wyxos::ShellNotificationCount());
-    EXPECT_TRUE(IconCalls().empty());
-    EXPECT_EQ(2u, m_model.GetErrorFolders().size());
-}
-
-TEST_F(FolderErrors, AcknowledgingAnUnmarkedFolderDoesNothing)
-{
+    Scene scene;
     for (const char* setting : {"0", "1"})
     {
-        UseSetting(setting);
-        EXPECT_EQ(NoErrorMarker, m_model.AcknowledgeFolderErrors(m_root.Path() + "/srv/hotfolders/Unknown"));
-        wxRemoveFile(ErrorMarkerPath(m_folders[0]));
-        EXPECT_EQ(NoErrorMarker, m_model.AcknowledgeFolderErrors(m_folders[0]));
+        scene.UseSetting(setting);
+        EXPECT_EQ(NoErrorMarker,
+                  scene.model.AcknowledgeFolderErrors(scene.root.Path() + "/srv/hotfolders/Unknown"));
     }
     EXPECT_EQ(0u, wyxos::ShellNotificationCount());
-    EXPECT_TRUE(IconCalls().empty());
-}
+    EXPECT_TRUE(scene.IconCalls().empty());
 
-TEST_F(FolderErrors, AcknowledgingAMarkedFolderClearsItAndRefreshesItAlone)
-{
-    UseSetting("0");
-    EXPECT_EQ(ErrorMarkerRemoved, m_model.AcknowledgeFolderErrors(m_folders[1]));
-    EXPECT_FALSE(IsMarked(m_folders[1]));
-    EXPECT_TRUE(IsMarked(m_folders[0]));
-    EXPECT_EQ((std::vector<wxString>{m_folders[1]}), IconCallFolders());
-    EXPECT_EQ(2u, m_model.GetErrorFolders().size());
+    scene.UseSetting("0");
+    EXPECT_EQ(ErrorMarkerRemoved, scene.model.AcknowledgeFolderErrors(scene.folders[1]));
+    EXPECT_FALSE(Scene::IsMarked(scene.folders[1]));
+    EXPECT_TRUE(Scene::IsMarked(scene.folders[0]));
+    EXPECT_EQ(NoErrorMarker, scene.model.AcknowledgeFolderErrors(scene.folders[1]));
+    EXPECT_EQ(std::vector<wxString>{scene.folders[1]}, scene.IconCalls());
+    EXPECT_EQ(2u, scene.model.GetErrorFolders().size());
 
-    UseSetting("1");
-    EXPECT_EQ(ErrorMarkerRemoved, m_model.AcknowledgeFolderErrors(m_folders[0]));
+    scene.UseSetting("1");
+    EXPECT_EQ(ErrorMarkerRemoved, scene.model.AcknowledgeFolderErrors(scene.folders[0]));
+    EXPECT_EQ(NoErrorMarker, scene.model.AcknowledgeFolderErrors(scene.folders[0]));
     EXPECT_EQ(1u, wyxos::ShellNotificationCount());
-    EXPECT_EQ(1u, IconCalls().size());
+    EXPECT_EQ(1u, scene.IconCalls().size());
 }
 
 // A marker the program cannot remove: a folder of that name with something in it.
-TEST_F(FolderErrors, MarkerThatCannotBeRemovedIsLeftAndTheRefreshStillHappens)
+TEST(FolderErrors, MarkerThatCannotBeRemovedIsLeftAndTheRefreshStillHappens)
 {
-    const wxString stuck = ErrorMarkerPath(m_folders[1]);
+    Scene scene;
+    const wxString stuck = ErrorMarkerPath(scene.folders[1]);
     wxRemoveFile(stuck);
     ASSERT_TRUE(wxFileName::Mkdir(stuck));
     SystemRoot::WriteFile(stuck + "/inside", "x");
 
-    UseSetting("0");
-    EXPECT_EQ(ErrorMarkerKept, m_model.AcknowledgeFolderErrors(m_folders[1]));
-    EXPECT_TRUE(IsMarked(m_folders[1]));
-    EXPECT_EQ((std::vector<wxString>{m_folders[1]}), IconCallFolders());
+    scene.UseSetting("0");
+    EXPECT_EQ(ErrorMarkerKept, scene.model.AcknowledgeFolderErrors(scene.folders[1]));
+    EXPECT_TRUE(Scene::IsMarked(scene.folders[1]));
+    EXPECT_EQ(std::vector<wxString>{scene.folders[1]}, scene.IconCalls());
 
-    UseSetting("1");
-    m_model.ClearLog();
-    EXPECT_TRUE(IsMarked(m_folders[1]));
-    EXPECT_FALSE(IsMarked(m_folders[0]));
-    EXPECT_FALSE(IsMarked(m_folders[2]));
+    scene.UseSetting("1");
+    scene.model.ClearLog();
+    EXPECT_TRUE(Scene::IsMarked(scene.folders[1]));
+    EXPECT_FALSE(Scene::IsMarked(scene.folders[0]));
+    EXPECT_FALSE(Scene::IsMarked(scene.folders[2]));
     EXPECT_EQ(1u, wyxos::ShellNotificationCount());
+}
+
+// Last: it loads a configuration for the rest of the process.
+TEST(FolderErrors, TheSettingComesFromTheConfiguration)
+{
+    Scene scene;
+    const wxString config = scene.root.Path() + "/WyxConfig.cfg";
+    SystemRoot::WriteFile(
+        config, "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<Configuration><WyxConfiguration>"
+                "<Entry key=\"ICON_SHELL_NOTIFY\" value=\"1\"/></WyxConfiguration></Configuration>\n");
+    ASSERT_TRUE(ConfigStore::Instance().LoadFile(config));
+    EXPECT_EQ("1", ReadIconRefreshSetting());
+    EXPECT_EQ(0, scene.model.ClearLog());
+    EXPECT_EQ(1u, wyxos::ShellNotificationCount());
+    EXPECT_TRUE(scene.IconCalls().empty());
+    for (const wxString& folder : scene.folders)
+        EXPECT_FALSE(Scene::IsMarked(folder)) << folder;
 }
 
 } // namespace

@@ -1,179 +1,333 @@
+// DOS date-times in the user's locale: the pattern walker, the strftime
+// conversion, and every installed locale checked against the C library.
 #include <gtest/gtest.h>
 
+#include <ctime>
+#include <langinfo.h>
+#include <locale.h>
+
+#include <wx/strconv.h>
+
 #include "data/DosTime.h"
+#include "platform/os/LocaleInfo.h"
 
 namespace
 {
 
-wyxos::LocaleNames EnglishNames()
-{
-    wyxos::LocaleNames names;
-    names.months = {"January", "February", "March",     "April",   "May",      "June",
-                    "July",    "August",   "September", "October", "November", "December"};
-    names.abbreviatedMonths = {"Jan", "Feb", "Mar", "Apr", "May", "Jun",
-                               "Jul", "Aug", "Sep", "Oct", "Nov", "Dec"};
-    names.days = {"Sunday", "Monday", "Tuesday", "Wednesday", "Thursday", "Friday", "Saturday"};
-    names.abbreviatedDays = {"Sun", "Mon", "Tue", "Wed", "Thu", "Fri", "Sat"};
-    names.am = "AM";
-    names.pm = "PM";
-    return names;
-}
+const wyxos::LocaleNames kEnglish{
+    {"January", "February", "March", "April", "May", "June", "July", "August", "September", "October",
+     "November", "December"},
+    {"Jan", "Feb", "Mar", "Apr", "May", "Jun", "Jul", "Aug", "Sep", "Oct", "Nov", "Dec"},
+    {"Sunday", "Monday", "Tuesday", "Wednesday", "Thursday", "Friday", "Saturday"},
+    {"Sun", "Mon", "Tue", "Wed", "Thu", "Fri", "Sat"},
+    "AM",
+    "PM"};
 
 // 15 March 2021 was a Monday.
-CalendarFields Moment(unsigned hour, unsigned minute = 5, unsigned second = 30)
+CalendarFields Moment(unsigned hour)
 {
-    CalendarFields fields;
-    fields.year = 2021;
-    fields.month = 3;
-    fields.day = 15;
-    fields.weekDay = 1;
-    fields.hour = hour;
-    fields.minute = minute;
-    fields.second = second;
-    return fields;
+    return CalendarFields{2021, 3, 15, 1, hour, 5, 30};
 }
 
-unsigned EncodeDos(unsigned year, unsigned month, unsigned day, unsigned hour, unsigned minute,
-                   unsigned second)
+wxString Dos(unsigned year, unsigned month, unsigned day, unsigned hour, unsigned minute, unsigned second)
 {
-    return ((year - 1980) << 25) | (month << 21) | (day << 16) | (hour << 11) | (minute << 5) | (second / 2);
-}
-
-wxString DosText(unsigned value)
-{
-    return wxString::Format("%u", value);
-}
-
-struct WalkCase
-{
-    const char* pattern;
-    unsigned hour;
-    const char* expected;
-};
-
-class DatePatternWalk : public testing::TestWithParam<WalkCase>
-{
-};
-
-TEST_P(DatePatternWalk, ProducesTheDocumentedItems)
-{
-    const WalkCase& c = GetParam();
-    EXPECT_EQ(WalkDatePattern(wxString::FromUTF8(c.pattern), Moment(c.hour), EnglishNames()),
-              wxString::FromUTF8(c.expected))
-        << c.pattern;
-}
-
-INSTANTIATE_TEST_SUITE_P(
-    Runs, DatePatternWalk,
-    testing::Values(WalkCase{"dd/MM/yy", 14, "15/03/21"}, WalkCase{"M/d/yy", 14, "3/15/21"},
-                    WalkCase{"d.M.yyyy", 14, "15.3.2021"}, WalkCase{"y", 14, "1"}, WalkCase{"yy", 14, "21"},
-                    WalkCase{"yyy", 14, ""}, WalkCase{"yyyy", 14, "2021"}, WalkCase{"yyyyy", 14, ""},
-                    WalkCase{"MMM", 14, "Mar"}, WalkCase{"MMMM", 14, "March"}, WalkCase{"MMMMM", 14, ""},
-                    WalkCase{"ddd", 14, "Mon"}, WalkCase{"dddd", 14, "Monday"}, WalkCase{"ddddd", 14, ""},
-                    WalkCase{"dddd, MMMM d, yyyy", 14, "Monday, March 15, 2021"},
-                    // Quotes are copied and the letters inside still count.
-                    WalkCase{"d 'de' MMMM", 14, "15 '15e' March"},
-                    WalkCase{"yyyy\xE5\xB9\xB4MM\xE6\x9C\x88", 14,
-                             "2021\xE5\xB9\xB4"
-                             "03\xE6\x9C\x88"},
-                    WalkCase{"", 14, ""}));
-
-class TimePatternWalk : public testing::TestWithParam<WalkCase>
-{
-};
-
-TEST_P(TimePatternWalk, ProducesTheDocumentedItems)
-{
-    const WalkCase& c = GetParam();
-    EXPECT_EQ(WalkTimePattern(wxString::FromUTF8(c.pattern), Moment(c.hour), EnglishNames()),
-              wxString::FromUTF8(c.expected))
-        << c.pattern << " at hour " << c.hour;
-}
-
-INSTANTIATE_TEST_SUITE_P(
-    Runs, TimePatternWalk,
-    testing::Values(WalkCase{"HH:mm:ss", 14, "14:05:30"}, WalkCase{"h:mm:ss tt", 14, "2:05:30 PM"},
-                    WalkCase{"h:mm tt", 0, "12:05 AM"}, WalkCase{"hh:mm tt", 0, "12:05 AM"},
-                    WalkCase{"h:mm t", 0, "12:05 A"}, WalkCase{"h:mm t", 12, "12:05 P"},
-                    WalkCase{"H:m:s", 9, "9:5:30"}, WalkCase{"HH", 9, "09"}, WalkCase{"hh", 21, "09"},
-                    WalkCase{"HHH", 9, ""}, WalkCase{"hhh", 9, ""}, WalkCase{"mmm", 9, ""},
-                    WalkCase{"sss", 9, ""}, WalkCase{"ttt", 9, ""}, WalkCase{"HH 'h'", 9, "09 '9'"},
-                    WalkCase{"H.mm", 23, "23.05"}));
-
-TEST(PatternWalk, NamesThatCouldNotBeFetchedProduceNothing)
-{
-    wyxos::LocaleNames names;
-    EXPECT_EQ(WalkDatePattern("MMMM d", Moment(14), names), " 15");
-    EXPECT_EQ(WalkTimePattern("h:mm t", Moment(14), names), "2:05 ");
-    EXPECT_EQ(WalkTimePattern("h:mm tt", Moment(14), names), "2:05 ");
+    return wxString::Format("%u", ((year - 1980) << 25) | (month << 21) | (day << 16) | (hour << 11) |
+                                      (minute << 5) | (second / 2));
 }
 
 wyxos::LocaleTimeInfo PatternInfo(const char* date, const char* time)
 {
     wyxos::LocaleTimeInfo info;
-    info.hasDatePattern = true;
+    info.hasDatePattern = info.hasTimePattern = true;
     info.datePattern = date;
-    info.hasTimePattern = true;
     info.timePattern = time;
-    info.names = EnglishNames();
+    info.names = kEnglish;
     return info;
 }
 
-TEST(FormatDosTime, SplitsTheValueIntoLocalDateAndTime)
+TEST(PatternWalk, ProducesTheDocumentedItems)
 {
-    const wxString text = DosText(EncodeDos(2021, 3, 15, 14, 5, 30));
-    EXPECT_EQ(FormatDosTime(text, PatternInfo("dd/MM/yy", "HH:mm:ss")), "15/03/21, 14:05:30");
+    struct Walk
+    {
+        bool date;
+        const char* pattern;
+        unsigned hour;
+        const char* expected;
+    };
+    // Runs longer than a field's longest form give nothing; quotes are copied
+    // and the letters inside still count.
+    for (const Walk& walk : {
+             Walk{true, "dd/MM/yy", 14, "15/03/21"},
+             Walk{true, "M/d/yy", 14, "3/15/21"},
+             Walk{true, "d.M.yyyy", 14, "15.3.2021"},
+             Walk{true, "y yy yyy yyyy yyyyy", 14, "1 21  2021 "},
+             Walk{true, "MMM MMMM MMMMM ddd dddd ddddd", 14, "Mar March  Mon Monday "},
+             Walk{true, "d 'de' MMMM", 14, "15 '15e' March"},
+             Walk{true, "yyyy\xE5\xB9\xB4MM\xE6\x9C\x88", 14,
+                  "2021\xE5\xB9\xB4"
+                  "03\xE6\x9C\x88"},
+             Walk{true, "", 14, ""},
+             Walk{false, "HH:mm:ss h:mm:ss tt", 14, "14:05:30 2:05:30 PM"},
+             Walk{false, "h:mm tt hh t", 0, "12:05 AM 12 A"},
+             Walk{false, "h:mm t", 12, "12:05 P"},
+             Walk{false, "H:m:s HH HHH hhh mmm sss ttt 'h'", 9, "9:5:30 09      '9'"},
+             Walk{false, "hh", 21, "09"},
+             Walk{false, "H.mm", 23, "23.05"},
+         })
+    {
+        const wxString pattern = wxString::FromUTF8(walk.pattern);
+        EXPECT_EQ(walk.date ? WalkDatePattern(pattern, Moment(walk.hour), kEnglish)
+                            : WalkTimePattern(pattern, Moment(walk.hour), kEnglish),
+                  wxString::FromUTF8(walk.expected))
+            << walk.pattern << " at hour " << walk.hour;
+    }
+    // Names that could not be fetched produce nothing.
+    const wyxos::LocaleNames none;
+    EXPECT_EQ(WalkDatePattern("MMMM d", Moment(14), none), " 15");
+    EXPECT_EQ(WalkTimePattern("h:mm t", Moment(14), none), "2:05 ");
+    EXPECT_EQ(WalkTimePattern("h:mm tt", Moment(14), none), "2:05 ");
+}
+
+TEST(FormatDosTime, SplitsTheValueIntoLocalDateAndTimeOfRealMomentsOnly)
+{
+    const wxString text = Dos(2021, 3, 15, 14, 5, 30);
+    const wyxos::LocaleTimeInfo info = PatternInfo("dd/MM/yy", "HH:mm:ss");
+    EXPECT_EQ(FormatDosTime(text, info), "15/03/21, 14:05:30");
     EXPECT_EQ(FormatDosTime(text, PatternInfo("M/d/yy", "h:mm:ss tt")), "3/15/21, 2:05:30 PM");
     EXPECT_EQ(FormatDosTime(text, PatternInfo("dddd", "h tt")), "Monday, 2 PM");
-    // Only the leading digits count.
-    EXPECT_EQ(FormatDosTime(text + "\tjunk 7", PatternInfo("dd/MM/yy", "HH:mm:ss")), "15/03/21, 14:05:30");
-}
-
-TEST(FormatDosTime, ComputesTheWeekDayOfEveryDate)
-{
-    const wyxos::LocaleTimeInfo info = PatternInfo("ddd yyyy-MM-dd", "HH");
-    for (wxDateTime day(1, wxDateTime::Jan, 1980); day.GetYear() < 2108; day += wxDateSpan::Days(97))
-    {
-        const wxString text = DosText(EncodeDos(day.GetYear(), day.GetMonth() + 1, day.GetDay(), 12, 0, 0));
-        EXPECT_EQ(FormatDosTime(text, info), day.Format("%a %Y-%m-%d, 12")) << text;
-    }
-}
-
-TEST(FormatDosTime, ValuesThatNameNoMomentGiveNoText)
-{
-    const wyxos::LocaleTimeInfo info = PatternInfo("dd/MM/yy", "HH:mm:ss");
-    for (const wxString& text :
+    EXPECT_EQ(FormatDosTime(text + "\tjunk 7", info), "15/03/21, 14:05:30")
+        << "only the leading digits count";
+    EXPECT_EQ(FormatDosTime(Dos(2020, 2, 29, 23, 59, 58), info), "29/02/20, 23:59:58");
+    EXPECT_EQ(FormatDosTime(Dos(2107, 12, 31, 0, 0, 0), info), "31/12/07, 00:00:00");
+    for (const wxString& none :
          {wxString(""), wxString("abc"), wxString("0"), wxString("-1"), wxString("99999999999999999999"),
-          DosText(EncodeDos(2021, 0, 15, 1, 1, 2)), DosText(EncodeDos(2021, 13, 15, 1, 1, 2)),
-          DosText(EncodeDos(2021, 2, 29, 1, 1, 2)), DosText(EncodeDos(2021, 4, 31, 1, 1, 2)),
-          DosText(EncodeDos(2021, 4, 0, 1, 1, 2)), DosText(EncodeDos(2021, 4, 1, 24, 1, 2)),
-          DosText(EncodeDos(2021, 4, 1, 1, 60, 2)), DosText(EncodeDos(2021, 4, 1, 1, 1, 60))})
-        EXPECT_EQ(FormatDosTime(text, info), "") << text;
-    EXPECT_EQ(FormatDosTime(DosText(EncodeDos(2020, 2, 29, 23, 59, 58)), info), "29/02/20, 23:59:58");
-    EXPECT_EQ(FormatDosTime(DosText(EncodeDos(2107, 12, 31, 0, 0, 0)), info), "31/12/07, 00:00:00");
+          Dos(2021, 0, 15, 1, 1, 2), Dos(2021, 13, 15, 1, 1, 2), Dos(2021, 2, 29, 1, 1, 2),
+          Dos(2021, 4, 31, 1, 1, 2), Dos(2021, 4, 0, 1, 1, 2), Dos(2021, 4, 1, 24, 1, 2),
+          Dos(2021, 4, 1, 1, 60, 2), Dos(2021, 4, 1, 1, 1, 60)})
+        EXPECT_EQ(FormatDosTime(none, info), "") << none;
+
+    const wyxos::LocaleTimeInfo weekDays = PatternInfo("ddd yyyy-MM-dd", "HH");
+    for (wxDateTime day(1, wxDateTime::Jan, 1980); day.GetYear() < 2108; day += wxDateSpan::Days(97))
+        EXPECT_EQ(FormatDosTime(Dos(day.GetYear(), day.GetMonth() + 1, day.GetDay(), 12, 0, 0), weekDays),
+                  day.Format("%a %Y-%m-%d, 12"));
 }
 
-TEST(FormatLocaleDateAndTime, FallBackToTheLibraryWhenThePatternFails)
-{
-    const CalendarFields fields = Moment(14);
-    const wxDateTime moment(15, wxDateTime::Mar, 2021, 14, 5, 30);
-    wyxos::LocaleTimeInfo unreadable;
-    EXPECT_EQ(FormatLocaleDate(fields, unreadable), moment.Format("%x"));
-    EXPECT_EQ(FormatLocaleTime(fields, unreadable), moment.Format("%X"));
-
-    const wyxos::LocaleTimeInfo empty = PatternInfo("yyy", "ttt");
-    EXPECT_EQ(FormatLocaleDate(fields, empty), moment.Format("%x"));
-    EXPECT_EQ(FormatLocaleTime(fields, empty), moment.Format("%X"));
-}
-
-TEST(FormatLocaleDateAndTime, UserLocaleVersionsAgreeWithTheExplicitOnes)
+TEST(FormatLocaleDateAndTime, FallBackToTheLibraryWhenThePatternFailsAndFollowTheUserLocale)
 {
     const wxDateTime moment(15, wxDateTime::Mar, 2021, 14, 5, 30);
+    for (const wyxos::LocaleTimeInfo& failing : {wyxos::LocaleTimeInfo(), PatternInfo("yyy", "ttt")})
+    {
+        EXPECT_EQ(FormatLocaleDate(Moment(14), failing), moment.Format("%x"));
+        EXPECT_EQ(FormatLocaleTime(Moment(14), failing), moment.Format("%X"));
+    }
     EXPECT_EQ(FormatLocaleDate(moment), FormatLocaleDate(Moment(14), UserLocaleTimeInfo()));
     EXPECT_EQ(FormatLocaleTime(moment), FormatLocaleTime(Moment(14), UserLocaleTimeInfo()));
     EXPECT_EQ(FormatLocaleDate(wxDateTime()), "");
-    EXPECT_EQ(FormatDosTime(DosText(EncodeDos(2021, 3, 15, 14, 5, 30))),
+    EXPECT_EQ(FormatDosTime(Dos(2021, 3, 15, 14, 5, 30)),
               FormatLocaleDate(moment) + ", " + FormatLocaleTime(moment));
+}
+
+TEST(StrftimeConversion, GivesTheWindowsLettersOrRefuses)
+{
+    constexpr auto D = wyxos::PatternKind::Date;
+    constexpr auto T = wyxos::PatternKind::Time;
+    struct Case
+    {
+        const char* format;
+        wyxos::PatternKind kind;
+        const char* expected; // nullptr: cannot be read
+    };
+    for (const Case& c : {
+             Case{"%m/%d/%y", D, "MM/dd/yy"},
+             Case{"%d.%m.%Y", D, "dd.MM.yyyy"},
+             Case{"%e.%m.%Y", D, "d.MM.yyyy"},
+             Case{"%-d.%-m.%Y", D, "d.M.yyyy"},
+             Case{"%a %d %b %Y", D, "ddd dd MMM yyyy"},
+             Case{"%A, %B %d", D, "dddd, MMMM dd"},
+             Case{"%D", D, "MM/dd/yy"},
+             Case{"%F", D, "yyyy-MM-dd"},
+             Case{"%Y\xE5\xB9\xB4%m\xE6\x9C\x88%d\xE6\x97\xA5", D,
+                  "yyyy\xE5\xB9\xB4MM\xE6\x9C\x88"
+                  "dd\xE6\x97\xA5"},
+             Case{"%H:%M:%S", T, "HH:mm:ss"},
+             Case{"%T", T, "HH:mm:ss"},
+             Case{"%R", T, "HH:mm"},
+             Case{"%r", T, "hh:mm:ss tt"},
+             Case{"%k:%M", T, "H:mm"},
+             Case{"%l:%M %p", T, "h:mm tt"},
+             Case{"%H%%%M", T, "HH%mm"},
+             Case{"%Y-%m-%d KW", D, "yyyy-MM-dd KW"},
+             Case{"%M%S", T, "mmss"},
+             // A literal letter the walker would read as a field.
+             Case{"%Hh%M", T, nullptr},
+             Case{"%d de %B", D, nullptr},
+             Case{"%Y y", D, nullptr},
+             Case{"%H:%M Uhr", T, nullptr},
+             // Neighbouring conversions that would merge into one longer run.
+             Case{"%d%e", D, nullptr},
+             Case{"%m%b", D, nullptr},
+             Case{"%H%k", T, nullptr},
+             // No equivalent, or a field of the other kind.
+             Case{"%Ey", D, nullptr},
+             Case{"%Oy", D, nullptr},
+             Case{"%j", D, nullptr},
+             Case{"%C%y", D, nullptr},
+             Case{"%x", D, nullptr},
+             Case{"%H:%M", D, nullptr},
+             Case{"%d %H", T, nullptr},
+             Case{"%P", T, nullptr},
+             Case{"%Z", T, nullptr},
+             Case{"%_H", T, nullptr},
+             Case{"%-y", D, nullptr},
+             Case{"%H%", T, nullptr},
+         })
+    {
+        wxString pattern = "untouched";
+        EXPECT_EQ(wyxos::ConvertStrftimePattern(wxString::FromUTF8(c.format), c.kind, "%I:%M:%S %p", pattern),
+                  c.expected != nullptr)
+            << c.format;
+        EXPECT_EQ(pattern, wxString::FromUTF8(c.expected ? c.expected : "untouched")) << c.format;
+    }
+    // The am/pm composite needs the locale's format, and one naming itself is not expanded for ever.
+    wxString pattern;
+    EXPECT_FALSE(wyxos::ConvertStrftimePattern("%r", T, "", pattern));
+    EXPECT_TRUE(wyxos::ConvertStrftimePattern("%r", T, "%p %I:%M", pattern));
+    EXPECT_EQ(pattern, "tt hh:mm");
+    EXPECT_FALSE(wyxos::ConvertStrftimePattern("%r", T, "%r", pattern));
+}
+
+// strftime's %x and %X of a locale, the reference our walker must meet.
+struct CLibraryLocale
+{
+    explicit CLibraryLocale(const char* name) : handle(newlocale(LC_ALL_MASK, name, nullptr)) {}
+    ~CLibraryLocale()
+    {
+        if (handle != nullptr)
+            freelocale(handle);
+    }
+    wxString Format(const char* format, const CalendarFields& f) const
+    {
+        std::tm tm{};
+        tm.tm_year = static_cast<int>(f.year) - 1900;
+        tm.tm_mon = static_cast<int>(f.month) - 1;
+        tm.tm_mday = static_cast<int>(f.day);
+        tm.tm_wday = static_cast<int>(f.weekDay);
+        tm.tm_hour = static_cast<int>(f.hour);
+        tm.tm_min = static_cast<int>(f.minute);
+        tm.tm_sec = static_cast<int>(f.second);
+        char buffer[256];
+        const size_t length = strftime_l(buffer, sizeof buffer, format, &tm, handle);
+        return wxString(buffer, wxCSConv(nl_langinfo_l(CODESET, handle)), length);
+    }
+    // True when the locale's own formats use a padding our letters cannot show.
+    bool UsesSpacePadding() const
+    {
+        for (nl_item item : {D_FMT, T_FMT, T_FMT_AMPM})
+            for (const char* padded : {"%e", "%k", "%l"})
+                if (std::string(nl_langinfo_l(item, handle)).find(padded) != std::string::npos)
+                    return true;
+        return false;
+    }
+    locale_t handle;
+};
+
+// Locales first that must be installed and convert; then others that are
+// compared where they convert, apart from the space padding that has no letter.
+TEST(LocaleReference, DateAndTimeEqualTheCLibrarysFormats)
+{
+    const std::vector<std::pair<const char*, bool>> locales = {{"C", true},
+                                                               {"en_US.UTF-8", true},
+                                                               {"de_DE.UTF-8", true},
+                                                               {"fr_FR.UTF-8", true},
+                                                               {"ja_JP.UTF-8", true},
+                                                               {"en_GB.UTF-8", true},
+                                                               {"zh_CN.UTF-8", true},
+                                                               {"ko_KR.UTF-8", true},
+                                                               {"ru_RU.UTF-8", true},
+                                                               {"cs_CZ.UTF-8", true},
+                                                               {"tr_TR.UTF-8", true},
+                                                               {"fi_FI.UTF-8", true},
+                                                               {"pt_BR.UTF-8", true},
+                                                               {"zh_TW.UTF-8", true},
+                                                               {"ja_JP.EUC-JP", true},
+                                                               {"de_DE.ISO-8859-1", true},
+                                                               {"es_ES.UTF-8", false},
+                                                               {"it_IT.UTF-8", false},
+                                                               {"nl_NL.UTF-8", false},
+                                                               {"pl_PL.UTF-8", false},
+                                                               {"hu_HU.UTF-8", false},
+                                                               {"fr_CA.UTF-8", false},
+                                                               {"sv_SE.UTF-8", false},
+                                                               {"da_DK.UTF-8", false},
+                                                               {"nb_NO.UTF-8", false},
+                                                               {"el_GR.UTF-8", false},
+                                                               {"he_IL.UTF-8", false},
+                                                               {"ar_EG.UTF-8", false},
+                                                               {"th_TH.UTF-8", false},
+                                                               {"vi_VN.UTF-8", false},
+                                                               {"hi_IN.UTF-8", false},
+                                                               {"uk_UA.UTF-8", false},
+                                                               {"bg_BG.UTF-8", false},
+                                                               {"pt_PT.UTF-8", false},
+                                                               {"en_AU.UTF-8", false},
+                                                               {"en_CA.UTF-8", false},
+                                                               {"fr_CH.UTF-8", false},
+                                                               {"de_CH.UTF-8", false},
+                                                               {"sk_SK.UTF-8", false},
+                                                               {"ro_RO.UTF-8", false},
+                                                               {"lt_LT.UTF-8", false}};
+    // One moment in each month and on each week day, at hours around the 12-hour edges.
+    std::vector<CalendarFields> moments;
+    for (unsigned i = 0; i < 12; ++i)
+    {
+        const wxDateTime day(static_cast<wxDateTime::wxDateTime_t>(1 + i * 2),
+                             static_cast<wxDateTime::Month>(i), 2000 + static_cast<int>(i * 9));
+        const unsigned hours[] = {0, 1, 9, 11, 12, 13, 23};
+        moments.push_back({static_cast<unsigned>(day.GetYear()), i + 1, day.GetDay(),
+                           static_cast<unsigned>(day.GetWeekDay()), hours[i % 7], i * 5 + 1, 58 - i * 4});
+    }
+    int lenientCompared = 0;
+    for (const auto& [name, required] : locales)
+    {
+        SCOPED_TRACE(name);
+        const CLibraryLocale reference(name);
+        wyxos::LocaleTimeInfo info;
+        const bool read = reference.handle != nullptr && wyxos::ReadLocaleTimeInfo(name, info);
+        if (required)
+            ASSERT_TRUE(read && info.hasDatePattern && info.hasTimePattern)
+                << "not installed or not converted";
+        else if (!read || reference.UsesSpacePadding())
+            continue;
+        for (const CalendarFields& fields : moments)
+        {
+            EXPECT_TRUE(!info.hasDatePattern ||
+                        FormatLocaleDate(fields, info) == reference.Format("%x", fields))
+                << info.datePattern << " gave " << FormatLocaleDate(fields, info);
+            EXPECT_TRUE(!info.hasTimePattern ||
+                        FormatLocaleTime(fields, info) == reference.Format("%X", fields))
+                << info.timePattern << " gave " << FormatLocaleTime(fields, info) << " at hour "
+                << fields.hour;
+        }
+        lenientCompared += !required && info.hasDatePattern && info.hasTimePattern;
+    }
+    EXPECT_GT(lenientCompared, 10);
+}
+
+TEST(LocaleInfo, ReadsNamesInTheLocalesOwnEncodingAndReportsAnUnknownLocale)
+{
+    wyxos::LocaleTimeInfo utf8;
+    wyxos::LocaleTimeInfo latin1;
+    ASSERT_TRUE(wyxos::ReadLocaleTimeInfo("de_DE.UTF-8", utf8));
+    ASSERT_TRUE(wyxos::ReadLocaleTimeInfo("de_DE.ISO-8859-1", latin1));
+    EXPECT_EQ(utf8.names.months[2], wxString::FromUTF8("M\xC3\xA4rz"));
+    EXPECT_EQ(latin1.names.months[2], utf8.names.months[2]);
+    EXPECT_EQ(utf8.names.days[0], "Sonntag");
+    EXPECT_EQ(utf8.names.abbreviatedDays[1], "Mo");
+
+    wyxos::LocaleTimeInfo info;
+    info.datePattern = "kept";
+    EXPECT_FALSE(wyxos::ReadLocaleTimeInfo("xx_NOWHERE.UTF-8", info));
+    EXPECT_EQ(info.datePattern, "kept");
 }
 
 } // namespace

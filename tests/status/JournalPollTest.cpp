@@ -1,0 +1,291 @@
+// How both models poll their journal (ChangedJournal): read only on a changed
+// stamp, never wait for the producer's lock, keep data and stamp when a read
+// fails so the change is read later, and report a busy or unreadable journal.
+#include <gtest/gtest.h>
+
+#include <sys/socket.h>
+#include <sys/stat.h>
+#include <sys/un.h>
+#include <unistd.h>
+
+#include <atomic>
+#include <functional>
+#include <set>
+#include <thread>
+
+#include "../log/LogTestSupport.h"
+#include "StatusTestSupport.h"
+#include "data/JobLogManager.h"
+#include "data/JobStatusManager.h"
+#include "data/NamedMutex.h"
+
+namespace
+{
+
+const auto* const kWx = testing::AddGlobalTestEnvironment(new statustest::WxEnvironment);
+
+struct StatusModelKind
+{
+    using Model = JobStatusManager;
+    static constexpr const char* kJournal = "TiveraJobsStatusFile";
+    static wxString Fields(const wxString& key) { return statustest::StatusLine(key, "").BeforeLast('\t'); }
+    // What a view shows: the status model's latest read.
+    static void Take(const Model& model, std::uint64_t&, std::vector<JobRecord>& shown)
+    {
+        shown.clear();
+        model.GetJobs(shown);
+    }
+};
+
+struct LogModelKind
+{
+    using Model = JobLogManager;
+    static constexpr const char* kJournal = "TiveraJobsLogFile";
+    static wxString Fields(const wxString& key) { return logtest::LogFields(key); }
+    // What a log view shows: every record handed over through its cursor.
+    static void Take(const Model& model, std::uint64_t& cursor, std::vector<JobRecord>& shown)
+    {
+        model.GetRecordsSince(cursor, shown);
+    }
+};
+
+// Reads the journal file, but answers `failWith` for the next `failures` reads.
+class FailingReader : public wyx::JobsFileReadWriter
+{
+public:
+    explicit FailingReader(const wxString& path) { SetPath(path); }
+    int ReadJobs(wxArrayString& lines) override
+    {
+        ++reads;
+        if (failures == 0)
+            return wyx::JobsFileReadWriter::ReadJobs(lines);
+        --failures;
+        return failWith;
+    }
+    int failWith = wyx::JobLockFailed;
+    int failures = 0;
+    int reads = 0;
+};
+
+template <typename Kind> class JournalPoll : public testing::Test
+{
+protected:
+    using Model = typename Kind::Model;
+
+    // Counts the updates either model publishes.
+    JournalPoll()
+    {
+        for (const wxEventType type :
+             {wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBLOG, wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS})
+            m_handler.Bind(wxEventTypeTag<wxCommandEvent>(type), [this](wxCommandEvent&) { ++m_updates; });
+        EventBus::Get().Subscribe(ChannelKey(1), &m_handler);
+        EventBus::Get().Subscribe(ChannelKey(2), &m_handler);
+    }
+    ~JournalPoll() override { EventBus::Get().Unsubscribe(&m_handler); }
+    wxString Journal() const { return GetDataDirectory() + Kind::kJournal + ".txt"; }
+    wxString LockPath() const { return m_root.Path() + "/dev/shm/" + Kind::kJournal + ".lock"; }
+    // Writes one ADDED line for each key.
+    void Write(std::initializer_list<wxString> keys)
+    {
+        wxString text;
+        for (const wxString& key : keys)
+            text += Kind::Fields(key) + "\tADDED\r\n";
+        wyxtest::SystemRoot::WriteFile(Journal(), text);
+    }
+    std::vector<wxString> Keys(const Model& model) const
+    {
+        std::uint64_t cursor = 0;
+        std::vector<JobRecord> shown;
+        Kind::Take(model, cursor, shown);
+        std::vector<wxString> keys;
+        for (const JobRecord& record : shown)
+            keys.push_back(record[0]);
+        return keys;
+    }
+    int Updates()
+    {
+        wxAppConsole::GetInstance()->ProcessPendingEvents();
+        return m_updates;
+    }
+    // A model reading through a FailingReader.
+    std::unique_ptr<Model> WithReader(FailingReader*& reader)
+    {
+        auto owned = std::make_unique<FailingReader>(Journal());
+        reader = owned.get();
+        return std::make_unique<Model>(Journal(), std::move(owned));
+    }
+
+    statustest::SystemRoot m_root;
+    Model m_model{Journal()};
+    wxEvtHandler m_handler;
+    int m_updates = 0;
+};
+
+using ModelKinds = testing::Types<StatusModelKind, LogModelKind>;
+TYPED_TEST_SUITE(JournalPoll, ModelKinds);
+
+TYPED_TEST(JournalPoll, ChangeMadeWhileTheProducerHoldsTheLockIsReadLater)
+{
+    EXPECT_EQ(this->m_model.Parse(), 0) << "no journal yet";
+    this->Write({"1"});
+    {
+        named_mutex_lock producer(TypeParam::kJournal);
+        ASSERT_TRUE(producer.try_lock());
+        EXPECT_EQ(this->m_model.Parse(), 0);
+        EXPECT_TRUE(this->Keys(this->m_model).empty());
+    }
+    EXPECT_EQ(this->m_model.Parse(), 1);
+    EXPECT_EQ(this->Keys(this->m_model), std::vector<wxString>{"1"});
+}
+
+TYPED_TEST(JournalPoll, AnIdlePollLeavesTheLockAloneAndAHeldLockMakesAChangedJournalBusy)
+{
+    this->Write({"1"});
+    ASSERT_EQ(this->m_model.Refresh(), 1);
+    named_mutex_lock producer(TypeParam::kJournal);
+    ASSERT_TRUE(producer.try_lock());
+    for (int poll = 0; poll < 2 * JournalWatch::kBusyPolls; ++poll)
+        EXPECT_EQ(this->m_model.Refresh(), 0);
+    EXPECT_EQ(this->m_model.GetJournalReport().state, JournalWatch::State::Readable) << "lock never tried";
+    EXPECT_EQ(this->Updates(), 1);
+
+    this->Write({"1", "2"});
+    for (int poll = 1; poll < JournalWatch::kBusyPolls; ++poll)
+        EXPECT_EQ(this->m_model.Refresh(), 0);
+    EXPECT_EQ(this->m_model.GetJournalReport().state, JournalWatch::State::Readable) << "a producer at work";
+    EXPECT_EQ(this->m_model.Refresh(), 0);
+    EXPECT_EQ(this->m_model.GetJournalReport().state, JournalWatch::State::Busy);
+    EXPECT_EQ(this->Updates(), 2) << "told of the busy journal";
+
+    producer.unlock();
+    EXPECT_EQ(this->m_model.Refresh(), 1);
+    EXPECT_EQ(this->m_model.GetJournalReport().state, JournalWatch::State::Readable);
+    EXPECT_TRUE(this->m_model.GetJournalReport().recovered);
+    EXPECT_EQ(this->Keys(this->m_model), (std::vector<wxString>{"1", "2"}));
+}
+
+TYPED_TEST(JournalPoll, ALockLostByTheReadKeepsDataAndStampAndIsRetriedWithoutAFurtherChange)
+{
+    FailingReader* reader = nullptr;
+    auto model = this->WithReader(reader);
+    this->Write({"1"});
+    ASSERT_EQ(model->Parse(), 1);
+
+    this->Write({"1", "2"});
+    reader->failures = 2;
+    EXPECT_EQ(model->Parse(), 0);
+    EXPECT_EQ(model->Parse(), 0);
+    EXPECT_EQ(this->Keys(*model), std::vector<wxString>{"1"});
+    EXPECT_EQ(model->Parse(), 1);
+    EXPECT_EQ(this->Keys(*model), (std::vector<wxString>{"1", "2"}));
+}
+
+TYPED_TEST(JournalPoll, AnUnreadableJournalIsReportedAndWaitsForItsNextChange)
+{
+    FailingReader* reader = nullptr;
+    auto model = this->WithReader(reader);
+    this->Write({"1"});
+    reader->failWith = wyx::JobFileMissing;
+    reader->failures = 1;
+    EXPECT_EQ(model->Parse(), 0);
+    EXPECT_EQ(model->GetJournalReport().state, JournalWatch::State::Unreadable);
+    EXPECT_EQ(model->Parse(), 0);
+    EXPECT_EQ(reader->reads, 1);
+
+    // Same length, same second: only the finer stamp tells the two apart.
+    this->Write({"2"});
+    EXPECT_EQ(model->Parse(), 1);
+    EXPECT_TRUE(model->GetJournalReport().recovered);
+    this->Write({"2", "3"});
+    ASSERT_EQ(model->Parse(), 1);
+    this->Write({"2", "4"});
+    EXPECT_EQ(model->Parse(), 1);
+    EXPECT_EQ(this->Keys(*model).back(), "4");
+}
+
+// Something other than a lock file, put where the journal's lock belongs.
+TYPED_TEST(JournalPoll, APlantedLockPathIsNeverWaitedOnAndMakesTheJournalUnreadable)
+{
+    const std::vector<std::pair<const char*, std::function<int(const char*)>>> plants = {
+        {"fifo", [](const char* path) { return ::mkfifo(path, 0666); }},
+        {"directory", [](const char* path) { return ::mkdir(path, 0777); }},
+        {"link", [](const char* path) { return ::symlink("/etc/passwd", path); }},
+        {"socket", [](const char* path)
+         {
+             const int fd = ::socket(AF_UNIX, SOCK_STREAM, 0);
+             sockaddr_un address{};
+             address.sun_family = AF_UNIX;
+             std::snprintf(address.sun_path, sizeof address.sun_path, "%s", path);
+             const int bound = ::bind(fd, reinterpret_cast<sockaddr*>(&address), sizeof address);
+             ::close(fd);
+             return bound;
+         }}};
+    ::mkdir((this->m_root.Path() + "/dev").utf8_str(), 0755);
+    ::mkdir((this->m_root.Path() + "/dev/shm").utf8_str(), 01777);
+    const std::string lock = this->LockPath().ToStdString();
+    for (const auto& [name, plant] : plants)
+    {
+        SCOPED_TRACE(name);
+        typename TypeParam::Model model(this->Journal());
+        const int updates = this->Updates();
+        this->Write({"1"});
+        ::unlink(lock.c_str()); // the lock file the last round left
+        ASSERT_EQ(plant(lock.c_str()), 0);
+        // A FIFO opened for reading would block here for ever.
+        EXPECT_EQ(model.Refresh(), 0);
+        EXPECT_EQ(model.GetJournalReport().state, JournalWatch::State::Unreadable);
+        EXPECT_EQ(model.Refresh(), 0);
+        EXPECT_EQ(this->Updates(), updates + 1) << "the view is told once";
+
+        ::unlink(lock.c_str());
+        ::rmdir(lock.c_str());
+        this->Write({"a", "b"});
+        EXPECT_EQ(model.Refresh(), 1);
+        EXPECT_TRUE(model.GetJournalReport().recovered);
+    }
+}
+
+// Producer, poller and the GUI thread at once; run under ThreadSanitizer too.
+TYPED_TEST(JournalPoll, PollerProducerAndViewTogetherLoseAndRepeatNothing)
+{
+    constexpr int kJobs = 200;
+    this->Write({});
+    std::atomic<bool> producing{true};
+    std::atomic<bool> polling{true};
+    std::thread producer(
+        [&]
+        {
+            wyx::JobsFileReadWriter journal;
+            journal.SetPath(this->Journal());
+            for (int i = 0; i < kJobs; ++i)
+            {
+                wxString fields = TypeParam::Fields(wxString::Format("job-%d", i));
+                EXPECT_EQ(journal.AddJob(fields), wyx::JobOk);
+            }
+            producing = false;
+        });
+    std::thread poller(
+        [&]
+        {
+            while (producing)
+                this->m_model.Refresh();
+            this->m_model.Refresh();
+            polling = false;
+        });
+    std::uint64_t cursor = 0;
+    std::vector<JobRecord> shown;
+    while (polling)
+        TypeParam::Take(this->m_model, cursor, shown);
+    producer.join();
+    poller.join();
+    TypeParam::Take(this->m_model, cursor, shown);
+
+    std::multiset<wxString> keys;
+    for (const JobRecord& record : shown)
+        keys.insert(record[0]);
+    EXPECT_EQ(shown.size(), static_cast<std::size_t>(kJobs));
+    for (int i = 0; i < kJobs; ++i)
+        EXPECT_EQ(keys.count(wxString::Format("job-%d", i)), 1u) << i;
+}
+
+} // namespace
