@@ -65,8 +65,7 @@ TEST(LogLineShapes, OnlyEightPiecesMakeARecord)
         {"k\t\th\tf\ts\t1\tst\td\tADDED", true},
         {"", false},
         {"\t\t\t", false},
-        {"ключ\th\tf\ts\t1\tÉchec\td\tADDED", true},
-    };
+        {"ключ\th\tf\ts\t1\tÉchec\td\tADDED", true}};
     for (const auto& [line, taken] : lines)
     {
         JobRecord record;
@@ -122,8 +121,7 @@ TEST_F(LogModel, LaterReadsTakeOnlyAddedLinesOfUnseenKeys)
     const std::vector<std::pair<const char*, bool>> lines = {
         {"Job-B\tADDED", true},     {"Job-B\tadded", true},    {"Job-B\tAdDeD", true},
         {"Job-B\tMODIFIED", false}, {"Job-B\tCOMMIT", false},  {"Job-A\tADDED", false},
-        {"JOB-a\tADDED", false},    {"ärger-1\tADDED", false}, {"0Job-A\tADDED", true},
-    };
+        {"JOB-a\tADDED", false},    {"ärger-1\tADDED", false}, {"0Job-A\tADDED", true}};
     for (const auto& [line, taken] : lines)
     {
         SCOPED_TRACE(line);

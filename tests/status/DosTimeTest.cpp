@@ -56,24 +56,18 @@ TEST(PatternWalk, ProducesTheDocumentedItems)
     };
     // Runs longer than a field's longest form give nothing; quotes are copied
     // and the letters inside still count.
-    for (const Walk& walk : {
-             Walk{true, "dd/MM/yy", 14, "15/03/21"},
-             Walk{true, "M/d/yy", 14, "3/15/21"},
-             Walk{true, "d.M.yyyy", 14, "15.3.2021"},
-             Walk{true, "y yy yyy yyyy yyyyy", 14, "1 21  2021 "},
-             Walk{true, "MMM MMMM MMMMM ddd dddd ddddd", 14, "Mar March  Mon Monday "},
-             Walk{true, "d 'de' MMMM", 14, "15 '15e' March"},
-             Walk{true, "yyyy\xE5\xB9\xB4MM\xE6\x9C\x88", 14,
-                  "2021\xE5\xB9\xB4"
-                  "03\xE6\x9C\x88"},
-             Walk{true, "", 14, ""},
-             Walk{false, "HH:mm:ss h:mm:ss tt", 14, "14:05:30 2:05:30 PM"},
-             Walk{false, "h:mm tt hh t", 0, "12:05 AM 12 A"},
-             Walk{false, "h:mm t", 12, "12:05 P"},
-             Walk{false, "H:m:s HH HHH hhh mmm sss ttt 'h'", 9, "9:5:30 09      '9'"},
-             Walk{false, "hh", 21, "09"},
-             Walk{false, "H.mm", 23, "23.05"},
-         })
+    for (const Walk& walk :
+         {Walk{true, "dd/MM/yy", 14, "15/03/21"}, Walk{true, "M/d/yy", 14, "3/15/21"},
+          Walk{true, "d.M.yyyy", 14, "15.3.2021"}, Walk{true, "y yy yyy yyyy yyyyy", 14, "1 21  2021 "},
+          Walk{true, "MMM MMMM MMMMM ddd dddd ddddd", 14, "Mar March  Mon Monday "},
+          Walk{true, "d 'de' MMMM", 14, "15 '15e' March"},
+          Walk{true, "yyyy\xE5\xB9\xB4MM\xE6\x9C\x88", 14,
+               "2021\xE5\xB9\xB4"
+               "03\xE6\x9C\x88"},
+          Walk{true, "", 14, ""}, Walk{false, "HH:mm:ss h:mm:ss tt", 14, "14:05:30 2:05:30 PM"},
+          Walk{false, "h:mm tt hh t", 0, "12:05 AM 12 A"}, Walk{false, "h:mm t", 12, "12:05 P"},
+          Walk{false, "H:m:s HH HHH hhh mmm sss ttt 'h'", 9, "9:5:30 09      '9'"},
+          Walk{false, "hh", 21, "09"}, Walk{false, "H.mm", 23, "23.05"}})
     {
         const wxString pattern = wxString::FromUTF8(walk.pattern);
         EXPECT_EQ(walk.date ? WalkDatePattern(pattern, Moment(walk.hour), kEnglish)
@@ -137,50 +131,27 @@ TEST(StrftimeConversion, GivesTheWindowsLettersOrRefuses)
         wyxos::PatternKind kind;
         const char* expected; // nullptr: cannot be read
     };
-    for (const Case& c : {
-             Case{"%m/%d/%y", D, "MM/dd/yy"},
-             Case{"%d.%m.%Y", D, "dd.MM.yyyy"},
-             Case{"%e.%m.%Y", D, "d.MM.yyyy"},
-             Case{"%-d.%-m.%Y", D, "d.M.yyyy"},
-             Case{"%a %d %b %Y", D, "ddd dd MMM yyyy"},
-             Case{"%A, %B %d", D, "dddd, MMMM dd"},
-             Case{"%D", D, "MM/dd/yy"},
-             Case{"%F", D, "yyyy-MM-dd"},
-             Case{"%Y\xE5\xB9\xB4%m\xE6\x9C\x88%d\xE6\x97\xA5", D,
-                  "yyyy\xE5\xB9\xB4MM\xE6\x9C\x88"
-                  "dd\xE6\x97\xA5"},
-             Case{"%H:%M:%S", T, "HH:mm:ss"},
-             Case{"%T", T, "HH:mm:ss"},
-             Case{"%R", T, "HH:mm"},
-             Case{"%r", T, "hh:mm:ss tt"},
-             Case{"%k:%M", T, "H:mm"},
-             Case{"%l:%M %p", T, "h:mm tt"},
-             Case{"%H%%%M", T, "HH%mm"},
-             Case{"%Y-%m-%d KW", D, "yyyy-MM-dd KW"},
-             Case{"%M%S", T, "mmss"},
-             // A literal letter the walker would read as a field.
-             Case{"%Hh%M", T, nullptr},
-             Case{"%d de %B", D, nullptr},
-             Case{"%Y y", D, nullptr},
-             Case{"%H:%M Uhr", T, nullptr},
-             // Neighbouring conversions that would merge into one longer run.
-             Case{"%d%e", D, nullptr},
-             Case{"%m%b", D, nullptr},
-             Case{"%H%k", T, nullptr},
-             // No equivalent, or a field of the other kind.
-             Case{"%Ey", D, nullptr},
-             Case{"%Oy", D, nullptr},
-             Case{"%j", D, nullptr},
-             Case{"%C%y", D, nullptr},
-             Case{"%x", D, nullptr},
-             Case{"%H:%M", D, nullptr},
-             Case{"%d %H", T, nullptr},
-             Case{"%P", T, nullptr},
-             Case{"%Z", T, nullptr},
-             Case{"%_H", T, nullptr},
-             Case{"%-y", D, nullptr},
-             Case{"%H%", T, nullptr},
-         })
+    for (const Case& c :
+         {Case{"%m/%d/%y", D, "MM/dd/yy"}, Case{"%d.%m.%Y", D, "dd.MM.yyyy"},
+          Case{"%e.%m.%Y", D, "d.MM.yyyy"}, Case{"%-d.%-m.%Y", D, "d.M.yyyy"},
+          Case{"%a %d %b %Y", D, "ddd dd MMM yyyy"}, Case{"%A, %B %d", D, "dddd, MMMM dd"},
+          Case{"%D", D, "MM/dd/yy"}, Case{"%F", D, "yyyy-MM-dd"},
+          Case{"%Y\xE5\xB9\xB4%m\xE6\x9C\x88%d\xE6\x97\xA5", D,
+               "yyyy\xE5\xB9\xB4MM\xE6\x9C\x88"
+               "dd\xE6\x97\xA5"},
+          Case{"%H:%M:%S", T, "HH:mm:ss"}, Case{"%T", T, "HH:mm:ss"}, Case{"%R", T, "HH:mm"},
+          Case{"%r", T, "hh:mm:ss tt"}, Case{"%k:%M", T, "H:mm"}, Case{"%l:%M %p", T, "h:mm tt"},
+          Case{"%H%%%M", T, "HH%mm"}, Case{"%Y-%m-%d KW", D, "yyyy-MM-dd KW"}, Case{"%M%S", T, "mmss"},
+          // A literal letter the walker would read as a field.
+          Case{"%Hh%M", T, nullptr}, Case{"%d de %B", D, nullptr}, Case{"%Y y", D, nullptr},
+          Case{"%H:%M Uhr", T, nullptr},
+          // Neighbouring conversions that would merge into one longer run.
+          Case{"%d%e", D, nullptr}, Case{"%m%b", D, nullptr}, Case{"%H%k", T, nullptr},
+          // No equivalent, or a field of the other kind.
+          Case{"%Ey", D, nullptr}, Case{"%Oy", D, nullptr}, Case{"%j", D, nullptr}, Case{"%C%y", D, nullptr},
+          Case{"%x", D, nullptr}, Case{"%H:%M", D, nullptr}, Case{"%d %H", T, nullptr},
+          Case{"%P", T, nullptr}, Case{"%Z", T, nullptr}, Case{"%_H", T, nullptr}, Case{"%-y", D, nullptr},
+          Case{"%H%", T, nullptr}})
     {
         wxString pattern = "untouched";
         EXPECT_EQ(wyxos::ConvertStrftimePattern(wxString::FromUTF8(c.format), c.kind, "%I:%M:%S %p", pattern),

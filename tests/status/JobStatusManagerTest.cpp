@@ -39,8 +39,7 @@ TEST(StatusLineParsing, ShowsOnlyWholeLinesOfLiveJobs)
         {"", false},
         {"\t\t\t", false},
         {"ADDED", false},
-        {StatusLine("1", "ADDED\r"), false},
-    };
+        {StatusLine("1", "ADDED\r"), false}};
     for (const auto& [line, shown] : lines)
     {
         JobRecord record;
@@ -143,8 +142,7 @@ TEST(JournalWatch, TellsOfABusyJournalAfterAFewPollsAndOfAnUnreadableOneAtOnce)
         // Busy since the first of three polls in a row; readable again when read.
         {"b-R0", "b-R0", "b!B1", "b-B1", "r!R5+", "r-R5+"},
         {"u!U1", "u-U1", "b-U1", "r!R4+"},
-        {"b-R0", "r-R0", "b-R0", "b-R0"},
-    };
+        {"b-R0", "r-R0", "b-R0", "b-R0"}};
     for (const auto& sequence : sequences)
     {
         JournalWatch watch;

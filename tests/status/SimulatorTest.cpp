@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <map>
 #include <set>
 #include <string>
 
@@ -8,8 +7,6 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <wx/dir.h>
-#include <wx/ffile.h>
 #include <wx/filename.h>
 #include <wx/tokenzr.h>
 
@@ -54,24 +51,26 @@ SimulatorOptions FastOptions(const SystemRoot& root)
     return options;
 }
 
-TEST(SimulatorOptions, ReadsEveryOption)
+// Runs the option parser over a command line given as one text.
+bool Parse(const char* line, SimulatorOptions& options)
 {
-    const char* argv[] = {"wyx-simulator",
-                          "--rate",
-                          "3/s",
-                          "--duration",
-                          "3600",
-                          "--failure-share",
-                          "0.5",
-                          "--seed",
-                          "42",
-                          "--data-dir",
-                          "/tmp/d",
-                          "--step-seconds",
-                          "0.1"};
-    SimulatorOptions options;
+    const wxArrayString words = wxSplit(line, ' ');
+    std::vector<std::string> texts(words.begin(), words.end());
+    std::vector<const char*> argv;
+    for (const std::string& text : texts)
+        argv.push_back(text.c_str());
     wxString problem;
-    ASSERT_TRUE(ParseSimulatorOptions(static_cast<int>(std::size(argv)), argv, options, problem)) << problem;
+    const bool parsed = ParseSimulatorOptions(static_cast<int>(argv.size()), argv.data(), options, problem);
+    EXPECT_EQ(parsed, problem.empty()) << line << ": " << problem;
+    return parsed;
+}
+
+TEST(SimulatorOptions, ReadsEveryOptionAndRefusesWhatItCannotRead)
+{
+    SimulatorOptions options;
+    ASSERT_TRUE(Parse("x --rate 3/s --duration 3600 --failure-share 0.5 --seed 42 --data-dir /tmp/d "
+                      "--step-seconds 0.1",
+                      options));
     EXPECT_DOUBLE_EQ(options.jobsPerSecond, 3);
     EXPECT_DOUBLE_EQ(options.durationSeconds, 3600);
     EXPECT_DOUBLE_EQ(options.failureShare, 0.5);
@@ -79,29 +78,11 @@ TEST(SimulatorOptions, ReadsEveryOption)
     EXPECT_TRUE(options.seedGiven);
     EXPECT_EQ(options.seed, 42u);
     EXPECT_EQ(options.dataDirectory, "/tmp/d");
-}
 
-TEST(SimulatorOptions, RefusesWhatItCannotRead)
-{
-    const std::vector<std::vector<const char*>> bad = {{"x", "--rate", "fast"},
-                                                       {"x", "--rate", "-3"},
-                                                       {"x", "--rate", "3/h"},
-                                                       {"x", "--failure-share", "2"},
-                                                       {"x", "--duration", "-1"},
-                                                       {"x", "--seed", "-4"},
-                                                       {"x", "--seed", "99999999999"},
-                                                       {"x", "--bogus", "1"},
-                                                       {"x", "--rate"},
-                                                       {"x", "stray"},
-                                                       {"x", "--data-dir", ""}};
-    for (const auto& argv : bad)
-    {
-        SimulatorOptions options;
-        wxString problem;
-        EXPECT_FALSE(ParseSimulatorOptions(static_cast<int>(argv.size()), argv.data(), options, problem))
-            << argv[1];
-        EXPECT_FALSE(problem.empty());
-    }
+    for (const char* bad :
+         {"x --rate fast", "x --rate -3", "x --rate 3/h", "x --failure-share 2", "x --duration -1",
+          "x --seed -4", "x --seed 99999999999", "x --bogus 1", "x --rate", "x stray", "x --data-dir "})
+        EXPECT_FALSE(Parse(bad, options)) << bad;
     double perSecond = 0;
     ASSERT_TRUE(ParseRate("30", perSecond));
     EXPECT_DOUBLE_EQ(perSecond, 0.5);
