@@ -8,40 +8,31 @@
 #include <wx/settings.h>
 #include <wx/uiaction.h>
 
-#include <memory>
 #include <vector>
 
 namespace
 {
 
 const wxColour kRed(255, 0, 0);
-const wxColour kGrey(128, 128, 128);
 const wxColour kPaper(255, 255, 255);
-const wxColour kFieldColour(0, 0, 160);
+const wxColour kField(0, 0, 160);
+const wxColour kInk(255, 255, 0);
 
-wxBitmap SolidImage(int width, int height, const wxColour& colour)
+wxBitmap SolidImage(const wxSize& size)
 {
-    wxImage image(width, height);
-    image.SetRGB(wxRect(0, 0, width, height), colour.Red(), colour.Green(), colour.Blue());
+    wxImage image(size);
+    image.SetRGB(wxRect(size), kRed.Red(), kRed.Green(), kRed.Blue());
     return wxBitmap(image);
 }
 
-struct ReceivedClick
-{
-    int id;
-    wxString text;
-};
-
-class ImageTextButtonTest : public testing::Test
+class ButtonTest : public testing::Test
 {
 protected:
     void SetUp() override
     {
         frame = new wxFrame(nullptr, wxID_ANY, "buttons", wxDefaultPosition, wxSize(300, 200));
         frame->Bind(wxEVT_IMAGE_TEXT_BUTTON_CLICK,
-                    [this](wxCommandEvent& event) {
-                        clicks.push_back({event.GetId(), event.GetString()});
-                    });
+                    [this](wxCommandEvent& event) { clicks.emplace_back(event.GetId(), event.GetString()); });
     }
 
     void TearDown() override
@@ -60,166 +51,132 @@ protected:
         return pixels::Render(size, kPaper, [&](wxDC& dc) { button.Render(dc, wxRect(size)); });
     }
 
-    // What the button must show: the field, then text and image where the test
-    // says they belong, drawn directly.
-    static wxImage Expected(const ImageTextButton& button, const wxSize& size, const wxColour& field,
-                            const wxColour& ink, const wxString& text, const wxPoint& textAt,
-                            const wxBitmap& image, const wxPoint& imageAt)
-    {
-        return pixels::Render(size, field,
-                              [&](wxDC& dc)
-                              {
-                                  dc.SetFont(button.GetFont());
-                                  dc.SetTextForeground(ink);
-                                  if (!text.empty())
-                                      dc.DrawText(text, textAt);
-                                  if (image.IsOk())
-                                      dc.DrawBitmap(image, imageAt, true);
-                              });
-    }
-
-    static int CentredTextTop(const ImageTextButton& button, const wxString& text, int height)
-    {
-        return (height - button.GetTextExtent(text).y) / 2;
-    }
-
     wxFrame* frame = nullptr;
-    std::vector<ReceivedClick> clicks;
+    bool painted = false;
+    std::vector<std::pair<int, wxString>> clicks;
 };
 
-TEST_F(ImageTextButtonTest, UsesTheSystemGuiFont)
+struct LookCase
 {
-    ImageTextButton* button = MakeButton(wxSize(115, 20));
+    const char* name;
+    wxSize size;
+    const char* text;
+    wxSize image; // 0 x 0: none
+    std::int32_t placement;
+    bool ownColours; // kInk on kField, else the default white on black
+    int textX;
+    wxPoint imageAt;
+};
+
+void PrintTo(const LookCase& c, std::ostream* out)
+{
+    *out << c.name;
+}
+
+class ButtonLook : public ButtonTest, public testing::WithParamInterface<LookCase>
+{
+};
+
+// The field, then the text centred vertically and the image where they belong.
+TEST_P(ButtonLook, ShowsTheTextAndTheImageInPlace)
+{
+    const LookCase& c = GetParam();
+    ImageTextButton* button = MakeButton(c.size);
     EXPECT_EQ(button->GetFont(), wxSystemSettings::GetFont(wxSYS_DEFAULT_GUI_FONT));
-    EXPECT_EQ(button->GetName(), "ImageTextButton");
-    EXPECT_FALSE(button->IsSeparator());
+    button->SetText(c.text);
+    const wxBitmap image = c.image.x > 0 ? SolidImage(c.image) : wxNullBitmap;
+    if (image.IsOk())
+        button->SetBitmap(image, c.placement);
+    if (c.ownColours)
+    {
+        button->SetButtonBackground(kField);
+        button->SetTextColour(kInk);
+    }
+    const wxImage expected = pixels::Render(c.size, c.ownColours ? kField : *wxBLACK,
+                                            [&](wxDC& dc)
+                                            {
+                                                dc.SetFont(button->GetFont());
+                                                dc.SetTextForeground(c.ownColours ? kInk : *wxWHITE);
+                                                const int y =
+                                                    (c.size.y - button->GetTextExtent(c.text).y) / 2;
+                                                dc.DrawText(c.text, c.textX, y);
+                                                if (image.IsOk())
+                                                    dc.DrawBitmap(image, c.imageAt, true);
+                                            });
+    EXPECT_EQ(pixels::FirstDifference(Paint(*button, c.size), expected), "");
 }
 
-TEST_F(ImageTextButtonTest, DefaultsAreWhiteTextOnBlack)
-{
-    const wxSize size(115, 20);
-    ImageTextButton* button = MakeButton(size);
-    button->SetText("Clear All");
-
-    const wxImage shown = Paint(*button, size);
-    const wxImage expected =
-        Expected(*button, size, *wxBLACK, *wxWHITE, "Clear All",
-                 wxPoint(0, CentredTextTop(*button, "Clear All", size.y)), wxNullBitmap, {});
-    EXPECT_EQ(pixels::FirstDifference(shown, expected), "");
-    EXPECT_TRUE(pixels::AnyPixelDiffersIn(shown, 0, size.x, *wxBLACK)) << "no text drawn";
-}
-
-TEST_F(ImageTextButtonTest, ImageFirstStandsAtTheLeftEdgeWithTheTextTwoPixelsAfterIt)
-{
-    const wxSize size(115, 20);
-    const wxBitmap image = SolidImage(8, 8, kRed);
-    ImageTextButton* button = MakeButton(size);
-    button->SetButtonBackground(kFieldColour);
-    button->SetTextColour(*wxWHITE);
-    button->SetText("Clear All");
-    button->SetBitmap(image, ImageTextButton::kImageFirst);
-
-    const wxImage shown = Paint(*button, size);
-    EXPECT_EQ(pixels::At(shown, 0, 6), kRed);
-    EXPECT_EQ(pixels::At(shown, 7, 13), kRed);
-    EXPECT_EQ(pixels::At(shown, 0, 5), kFieldColour);
-    EXPECT_EQ(pixels::At(shown, 0, 14), kFieldColour);
-    EXPECT_FALSE(pixels::AnyPixelDiffersIn(shown, 8, 10, kFieldColour)) << "the gap must stay empty";
-
-    const wxImage expected =
-        Expected(*button, size, kFieldColour, *wxWHITE, "Clear All",
-                 wxPoint(10, CentredTextTop(*button, "Clear All", size.y)), image, {0, 6});
-    EXPECT_EQ(pixels::FirstDifference(shown, expected), "");
-}
-
-TEST_F(ImageTextButtonTest, ImageLastEndsTwoPixelsInsideTheRightEdge)
-{
-    const wxSize size(115, 20);
-    const wxBitmap image = SolidImage(8, 8, kRed);
-    ImageTextButton* button = MakeButton(size);
-    button->SetButtonBackground(kFieldColour);
-    button->SetText("Clear All");
-    button->SetBitmap(image, ImageTextButton::kImageLast);
-
-    const wxImage shown = Paint(*button, size);
-    EXPECT_EQ(pixels::At(shown, 105, 6), kRed);
-    EXPECT_EQ(pixels::At(shown, 112, 13), kRed);
-    EXPECT_EQ(pixels::At(shown, 104, 10), kFieldColour);
-    EXPECT_FALSE(pixels::AnyPixelDiffersIn(shown, 113, 115, kFieldColour));
-
-    const wxImage expected =
-        Expected(*button, size, kFieldColour, *wxWHITE, "Clear All",
-                 wxPoint(0, CentredTextTop(*button, "Clear All", size.y)), image, {105, 6});
-    EXPECT_EQ(pixels::FirstDifference(shown, expected), "");
-}
-
-TEST_F(ImageTextButtonTest, TextLongerThanTheButtonRunsUnderTheImageAtTheEnd)
-{
-    const wxSize size(40, 20);
-    const wxString text = "A text much longer than the button";
-    const wxBitmap image = SolidImage(8, 8, kRed);
-    ImageTextButton* button = MakeButton(size);
-    button->SetText(text);
-    button->SetBitmap(image, ImageTextButton::kImageLast);
-
-    const wxImage expected = Expected(*button, size, *wxBLACK, *wxWHITE, text,
-                                      wxPoint(0, CentredTextTop(*button, text, size.y)), image, {30, 6});
-    EXPECT_EQ(pixels::FirstDifference(Paint(*button, size), expected), "");
-}
-
-TEST_F(ImageTextButtonTest, ImageWithoutTextIsCentredVertically)
-{
-    const wxSize size(30, 21);
-    const wxBitmap image = SolidImage(6, 5, kRed);
-    ImageTextButton* button = MakeButton(size);
-    button->SetBitmap(image, ImageTextButton::kImageFirst);
-
-    const wxImage expected = Expected(*button, size, *wxBLACK, *wxWHITE, "", {}, image, {0, 8});
-    EXPECT_EQ(pixels::FirstDifference(Paint(*button, size), expected), "");
-}
+INSTANTIATE_TEST_SUITE_P(
+    ButtonLooks, ButtonLook,
+    testing::Values(
+        LookCase{"TextAloneWhiteOnBlack",
+                 {115, 20},
+                 "Clear All",
+                 {0, 0},
+                 ImageTextButton::kImageFirst,
+                 false,
+                 0,
+                 {}},
+        LookCase{"ImageFirstTextTwoPixelsAfter",
+                 {115, 20},
+                 "Clear All",
+                 {8, 8},
+                 ImageTextButton::kImageFirst,
+                 true,
+                 10,
+                 {0, 6}},
+        LookCase{"ImageLastTwoPixelsInside",
+                 {115, 20},
+                 "Clear All",
+                 {8, 8},
+                 ImageTextButton::kImageLast,
+                 true,
+                 0,
+                 {105, 6}},
+        LookCase{"LongTextRunsUnderTheImage",
+                 {40, 20},
+                 "A text much longer than the button",
+                 {8, 8},
+                 ImageTextButton::kImageLast,
+                 false,
+                 0,
+                 {30, 6}},
+        LookCase{"ImageAloneCentred", {30, 21}, "", {6, 5}, ImageTextButton::kImageFirst, false, 0, {0, 8}}),
+    [](const testing::TestParamInfo<LookCase>& info) { return std::string(info.param.name); });
 
 struct SeparatorCase
 {
     wxSize size;
-    // Lines drawn: columns when vertical, rows when horizontal.
-    bool vertical;
+    bool vertical; // lines drawn: columns when vertical, rows when horizontal
     int first;
 };
 
-class SeparatorTest : public ImageTextButtonTest, public testing::WithParamInterface<SeparatorCase>
+class ButtonSeparator : public ButtonTest, public testing::WithParamInterface<SeparatorCase>
 {
 };
 
-TEST_P(SeparatorTest, DrawsTwoGreyLinesThroughTheMiddleAndNothingElse)
+TEST_P(ButtonSeparator, DrawsTwoGreyLinesThroughTheMiddleAndNothingElse)
 {
     const SeparatorCase& c = GetParam();
     ImageTextButton* button = MakeButton(c.size);
     button->SetBackgroundColour(kPaper);
     button->SetText("not shown");
-    button->SetBitmap(SolidImage(4, 4, kRed), ImageTextButton::kImageFirst);
+    button->SetBitmap(SolidImage({4, 4}), ImageTextButton::kImageFirst);
     button->SetSeparator();
     ASSERT_TRUE(button->IsSeparator());
-
     const wxImage expected =
         pixels::Render(c.size, kPaper,
                        [&](wxDC& dc)
                        {
-                           dc.SetPen(*wxGREY_PEN);
+                           dc.SetPen(wxPen(wxColour(128, 128, 128)));
                            for (int line = c.first; line <= c.first + 1; ++line)
-                           {
                                for (int along = 0; along < (c.vertical ? c.size.y : c.size.x); ++along)
-                               {
-                                   if (c.vertical)
-                                       dc.DrawPoint(line, along);
-                                   else
-                                       dc.DrawPoint(along, line);
-                               }
-                           }
+                                   dc.DrawPoint(c.vertical ? line : along, c.vertical ? along : line);
                        });
     EXPECT_EQ(pixels::FirstDifference(Paint(*button, c.size), expected), "");
 }
 
-INSTANTIATE_TEST_SUITE_P(Shapes, SeparatorTest,
+INSTANTIATE_TEST_SUITE_P(ButtonShapes, ButtonSeparator,
                          testing::Values(
                              // The view's 1 x 20 separator: columns -1 and 0, so only column 0 shows.
                              SeparatorCase{wxSize(1, 20), true, -1}, SeparatorCase{wxSize(10, 40), true, 4},
@@ -227,67 +184,44 @@ INSTANTIATE_TEST_SUITE_P(Shapes, SeparatorTest,
                              // Square: horizontal.
                              SeparatorCase{wxSize(12, 12), false, 5}));
 
-TEST_F(ImageTextButtonTest, TheOneBySeparatorShowsAFullGreyColumn)
-{
-    const wxSize size(1, 20);
-    ImageTextButton* button = MakeButton(size);
-    button->SetSeparator();
-    const wxImage shown = Paint(*button, size);
-    for (int y = 0; y < size.y; ++y)
-        EXPECT_EQ(pixels::At(shown, 0, y), kGrey) << "row " << y;
-}
-
-TEST_F(ImageTextButtonTest, LeftPressPostsTheIdAndTheTextWithoutTrailingBlanks)
+TEST_F(ButtonTest, EachPressPostsTheIdAndTheTextWithoutTrailingBlanks)
 {
     ImageTextButton* button = MakeButton(wxSize(115, 20), 6007);
     button->SetText("  Clear All \t ");
-
-    wxMouseEvent press(wxEVT_LEFT_DOWN);
-    press.SetEventObject(button);
-    const bool handled = button->GetEventHandler()->ProcessEvent(press);
-
-    EXPECT_TRUE(handled);
-    EXPECT_FALSE(press.GetSkipped()) << "the press must go no further";
+    EXPECT_FALSE(button->IsSeparator());
+    for (int press = 0; press < 2; ++press)
+    {
+        wxMouseEvent event(wxEVT_LEFT_DOWN);
+        event.SetEventObject(button);
+        EXPECT_TRUE(button->GetEventHandler()->ProcessEvent(event));
+        EXPECT_FALSE(event.GetSkipped()) << "the press must go no further";
+    }
     EXPECT_TRUE(clicks.empty()) << "the click is queued, not sent";
-
     wxTheApp->ProcessPendingEvents();
-    ASSERT_EQ(clicks.size(), 1u);
-    EXPECT_EQ(clicks[0].id, 6007);
-    EXPECT_EQ(clicks[0].text, "  Clear All");
+    const std::pair<int, wxString> click{6007, "  Clear All"};
+    EXPECT_EQ(clicks, (std::vector<std::pair<int, wxString>>{click, click}));
     EXPECT_EQ(button->GetText(), "  Clear All \t ") << "the button keeps its own text";
 }
 
-TEST_F(ImageTextButtonTest, EachPressPostsOneClick)
-{
-    ImageTextButton* button = MakeButton(wxSize(115, 20), 6007);
-    button->SetText("Clear All");
-    for (int i = 0; i < 3; ++i)
-    {
-        wxMouseEvent press(wxEVT_LEFT_DOWN);
-        press.SetEventObject(button);
-        button->GetEventHandler()->ProcessEvent(press);
-    }
-    wxTheApp->ProcessPendingEvents();
-    EXPECT_EQ(clicks.size(), 3u);
-}
-
-TEST_F(ImageTextButtonTest, ARealClickOnTheShownButtonReachesTheParent)
+TEST_F(ButtonTest, ARealClickOnTheShownButtonReachesTheParent)
 {
     ImageTextButton* button = MakeButton(wxSize(115, 20), 6007);
     button->SetText("Clear All ");
+    button->Bind(wxEVT_PAINT,
+                 [this](wxPaintEvent& event)
+                 {
+                     painted = true;
+                     event.Skip();
+                 });
     frame->Show();
-    guitest::Pump(100);
-
+    ASSERT_TRUE(guitest::PumpUntil([this] { return painted; }));
+    const wxPoint at = button->ClientToScreen(wxPoint(50, 10));
     wxUIActionSimulator input;
-    input.MouseMove(button->ClientToScreen(wxPoint(50, 10)));
-    guitest::Pump(20);
+    input.MouseMove(at);
+    guitest::PumpUntil([&at] { return wxGetMousePosition() == at; });
     input.MouseClick();
-    for (int round = 0; round < 200 && clicks.empty(); ++round)
-        guitest::Pump(10);
-
-    ASSERT_EQ(clicks.size(), 1u);
-    EXPECT_EQ(clicks[0].id, 6007);
-    EXPECT_EQ(clicks[0].text, "Clear All");
+    ASSERT_TRUE(guitest::PumpUntil([this] { return !clicks.empty(); }));
+    EXPECT_EQ(clicks, (std::vector<std::pair<int, wxString>>{{6007, "Clear All"}}));
 }
 
 } // namespace
