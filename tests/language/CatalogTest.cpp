@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <fstream>
 #include <map>
 #include <set>
 #include <string>
@@ -11,7 +12,6 @@
 #include <wx/intl.h>
 #include <wx/translation.h>
 
-#include "GettextFile.h"
 #include "TempFolder.h"
 #include "app/language/ServiceTexts.h"
 #include "app/language/SupportedLanguages.h"
@@ -27,6 +27,36 @@ void PrintTo(const SupportedLanguage& language, std::ostream* out)
 
 namespace
 {
+
+// The English keys (msgids) of a gettext template or catalog, without the
+// header's empty key and without obsolete entries.
+std::set<std::string> ReadMsgids(const std::string& path)
+{
+    std::set<std::string> ids;
+    std::ifstream file(path);
+    std::string current;
+    bool inMsgid = false;
+    for (std::string line; std::getline(file, line);)
+    {
+        const bool starts = line.rfind("msgid \"", 0) == 0;
+        if (starts || !inMsgid || line.rfind('"', 0) != 0)
+        {
+            if (inMsgid && !current.empty())
+                ids.insert(current);
+            inMsgid = starts;
+            current.clear();
+        }
+        // Unquote what follows the keyword, if this line carries a piece of the key.
+        for (std::size_t i = starts ? 7 : 1; inMsgid && i + 1 < line.size(); ++i)
+            current += line[i] != '\\' || i + 2 >= line.size() ? line[i]
+                       : line[++i] == 'n'                      ? '\n'
+                       : line[i] == 't'                        ? '\t'
+                                                               : line[i];
+    }
+    if (inMsgid && !current.empty())
+        ids.insert(current);
+    return ids;
+}
 
 // One text per language, as an operator reads it: proves that each language
 // finds its own catalog, not a neighbour's (zh_TW is not zh_CN).

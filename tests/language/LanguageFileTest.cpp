@@ -19,86 +19,55 @@
 namespace
 {
 
-using uilanguage::DecodeLanguageFile;
-using uilanguage::ServerFileCode;
 using uilanguage::UserFileCode;
-
-struct DecodeCase
-{
-    const char* name;
-    std::string bytes;
-    const char* expectedUtf8;
-};
 
 TEST(LanguageFileTest, DecodesByMarkThenUtf8ThenLatin1)
 {
-    const DecodeCase cases[] = {
-        {"utf8 mark", std::string("\xEF\xBB\xBF") + "de_DE\n", "de_DE\n"},
-        {"utf16 little-endian mark", std::string("\xFF\xFE") + std::string("f\0r\0_\0F\0R\0", 10), "fr_FR"},
-        {"utf16 big-endian mark", std::string("\xFE\xFF\0j\0a\0_\0J\0P", 12), "ja_JP"},
-        {"utf8 without mark", "serverlang=de # \xC3\xA9t\xC3\xA9", "serverlang=de # \xC3\xA9t\xC3\xA9"},
-        {"latin-1 fallback", "serverlang=de # \xE9t\xE9", "serverlang=de # \xC3\xA9t\xC3\xA9"},
-        {"empty", "", ""},
-        {"mark only", "\xEF\xBB\xBF", ""},
-    };
-    for (const DecodeCase& c : cases)
-        EXPECT_EQ(DecodeLanguageFile(c.bytes).utf8_string(), c.expectedUtf8) << c.name;
-}
-
-struct UserCodeCase
-{
-    const char* text;
-    const char* expected;
-};
-
-TEST(LanguageFileTest, TheUserFileCodeIsItsTrimmedFirstLine)
-{
-    const UserCodeCase cases[] = {
-        {"de_DE", "de_DE"},
-        {" \t de_DE \t", "de_DE"},
-        {"de_DE\r\nfr_FR\r\n", "de_DE"},
-        {"de_DE\rfr_FR", "de_DE"},
-        {"\nde_DE", ""},
+    const std::pair<std::string, const char*> cases[] = {
+        {std::string("\xEF\xBB\xBF") + "de_DE\n", "de_DE\n"},
+        {std::string("\xFF\xFE") + std::string("f\0r\0_\0F\0R\0", 10), "fr_FR"},
+        {std::string("\xFE\xFF\0j\0a\0_\0J\0P", 12), "ja_JP"},
+        {"serverlang=de # \xC3\xA9t\xC3\xA9", "serverlang=de # \xC3\xA9t\xC3\xA9"},
+        {"serverlang=de # \xE9t\xE9", "serverlang=de # \xC3\xA9t\xC3\xA9"}, // Latin-1
         {"", ""},
-        {"   \n", ""},
-        {"de DE", "de DE"},
+        {"\xEF\xBB\xBF", ""},
     };
-    for (const UserCodeCase& c : cases)
-        EXPECT_EQ(UserFileCode(c.text), c.expected) << c.text;
+    for (const auto& [bytes, expected] : cases)
+        EXPECT_EQ(uilanguage::DecodeLanguageFile(bytes).utf8_string(), expected) << expected;
 }
 
-struct ServerCodeCase
+TEST(LanguageFileTest, TheUserCodeIsTheTrimmedFirstLineAndTheServerCodeTheLastServerlangLine)
 {
-    const char* text;
-    bool found;
-    const char* expected;
-};
+    const std::pair<const char*, const char*> user[] = {{"de_DE", "de_DE"},
+                                                        {" \t de_DE \t", "de_DE"},
+                                                        {"de_DE\r\nfr_FR\r\n", "de_DE"},
+                                                        {"de_DE\rfr_FR", "de_DE"},
+                                                        {"\nde_DE", ""},
+                                                        {"", ""},
+                                                        {"   \n", ""},
+                                                        {"de DE", "de DE"}};
+    for (const auto& [text, expected] : user)
+        EXPECT_EQ(UserFileCode(text), expected) << text;
 
-TEST(LanguageFileTest, TheServerFileCodeComesFromItsLastServerlangLine)
-{
-    const ServerCodeCase cases[] = {
-        {"serverlang=fr", true, "fr"},
-        {"serverlang = fr \n", true, "fr"},
-        {"serverlang=fr\nserverlang=de\n", true, "de"},
-        {"a=1\nserverlang=de\nx=2", true, "de"},
-        {"serverlang=de\r\nother=fr\r\n", true, "de"},
-        {"serverlang=a=b", true, "a=b"},
-        {"serverlang=it\nserverlang", true, ""},
-        {"\n\nserverlang=ko\n\n", true, "ko"},
-        {"a=de", false, ""},
-        {"x\na=de", false, ""},
-        {" serverlang=de", false, ""},
-        {"SERVERLANG=de", false, ""},
-        {"", false, ""},
-    };
-    for (const ServerCodeCase& c : cases)
+    const char* const none = nullptr; // no serverlang line
+    const std::pair<const char*, const char*> server[] = {{"serverlang=fr", "fr"},
+                                                          {"serverlang = fr \n", "fr"},
+                                                          {"serverlang=fr\nserverlang=de\n", "de"},
+                                                          {"a=1\nserverlang=de\nx=2", "de"},
+                                                          {"serverlang=de\r\nother=fr\r\n", "de"},
+                                                          {"serverlang=a=b", "a=b"},
+                                                          {"serverlang=it\nserverlang", ""},
+                                                          {"\n\nserverlang=ko\n\n", "ko"},
+                                                          {"a=de", none},
+                                                          {"x\na=de", none},
+                                                          {" serverlang=de", none},
+                                                          {"SERVERLANG=de", none},
+                                                          {"", none}};
+    for (const auto& [text, expected] : server)
     {
         wxString code;
-        EXPECT_EQ(ServerFileCode(c.text, code), c.found) << c.text;
-        if (c.found)
-        {
-            EXPECT_EQ(code, c.expected) << c.text;
-        }
+        EXPECT_EQ(uilanguage::ServerFileCode(text, code), expected != nullptr) << text;
+        EXPECT_EQ(code, expected ? wxString(expected) : code) << text;
     }
 }
 
@@ -106,75 +75,46 @@ TEST(LanguageFileTest, TheServerFileCodeComesFromItsLastServerlangLine)
 class LanguagePlacesTest : public ::testing::Test
 {
 protected:
-    void SetUp() override
-    {
-        ASSERT_FALSE(folder.Path().empty());
-        ::setenv("XDG_CONFIG_HOME", (folder.Path() / "config").c_str(), 1);
-        ::setenv("WYX_SYSTEM_ROOT", (folder.Path() / "root").c_str(), 1);
-    }
-    void TearDown() override
-    {
-        ::unsetenv("XDG_CONFIG_HOME");
-        ::unsetenv("WYX_SYSTEM_ROOT");
-    }
-
-    static constexpr const char* kUserFile = "config/Corvane Quillet/current.lang";
-    static constexpr const char* kServerFile = "root/srv/kelvo/server/lcdstr/current.lang";
-
     wxInitializer init;
     TempFolder folder;
-};
-
-TEST_F(LanguagePlacesTest, ReadsBothFilesFromTheirPlaces)
-{
-    folder.Write(kUserFile, "\xEF\xBB\xBFit_IT\n");
-    folder.Write(kServerFile, "serverlang=cs\n");
+    ScopedEnv config{"XDG_CONFIG_HOME", (folder.Path() / "config").string()};
+    ScopedEnv root{"WYX_SYSTEM_ROOT", (folder.Path() / "root").string()};
+    const std::string user = "config/Corvane Quillet/current.lang";
+    const std::string server = "root/srv/kelvo/server/lcdstr/current.lang";
     const uilanguage::SystemLanguageSources sources;
     wxString text;
+};
+
+TEST_F(LanguagePlacesTest, ReadsBothFilesFromTheirPlacesAndAMissingOneAsNone)
+{
+    EXPECT_FALSE(sources.ReadUserFile(text));
+    EXPECT_FALSE(sources.ReadServerFile(text));
+    folder.Write(user, "");
+    ASSERT_TRUE(sources.ReadUserFile(text));
+    EXPECT_EQ(UserFileCode(text), "");
+
+    folder.Write(user, "\xEF\xBB\xBFit_IT\n");
+    folder.Write(server, "serverlang=cs\n");
     ASSERT_TRUE(sources.ReadUserFile(text));
     EXPECT_EQ(text, "it_IT\n");
     ASSERT_TRUE(sources.ReadServerFile(text));
     EXPECT_EQ(text, "serverlang=cs\n");
 }
 
-TEST_F(LanguagePlacesTest, AMissingOrEmptyFileHasNoCode)
+TEST_F(LanguagePlacesTest, AFifoOrFolderInAFilesPlaceIsNotWaitedForNorReadButALinkToAFileIs)
 {
-    const uilanguage::SystemLanguageSources sources;
-    wxString text;
+    std::filesystem::remove(folder.Write(user, ""));
+    ASSERT_EQ(::mkfifo((folder.Path() / user).c_str(), 0600), 0);
+    std::filesystem::remove(folder.Write(server, ""));
+    std::filesystem::create_directory(folder.Path() / server);
     EXPECT_FALSE(sources.ReadUserFile(text));
     EXPECT_FALSE(sources.ReadServerFile(text));
 
-    folder.Write(kUserFile, "");
-    ASSERT_TRUE(sources.ReadUserFile(text));
-    EXPECT_EQ(UserFileCode(text), "");
-}
-
-TEST_F(LanguagePlacesTest, AFifoOrFolderInAFilesPlaceIsNotWaitedForNorRead)
-{
-    const std::filesystem::path user = folder.Write(kUserFile, "");
-    std::filesystem::remove(user);
-    ASSERT_EQ(::mkfifo(user.c_str(), 0600), 0);
-    const std::filesystem::path server = folder.Write(kServerFile, "");
-    std::filesystem::remove(server);
-    std::filesystem::create_directory(server);
-
-    const uilanguage::SystemLanguageSources sources;
-    wxString text;
-    EXPECT_FALSE(sources.ReadUserFile(text));
-    EXPECT_FALSE(sources.ReadServerFile(text));
-}
-
-TEST_F(LanguagePlacesTest, ALinkIsFollowedToAFileButNotToAFifo)
-{
     const std::filesystem::path target = folder.Write("elsewhere/lang", "ru_RU");
-    const std::filesystem::path user = folder.Write(kUserFile, "");
-    std::filesystem::remove(user);
-    std::filesystem::create_symlink(target, user);
-    const uilanguage::SystemLanguageSources sources;
-    wxString text;
+    std::filesystem::remove(folder.Path() / user);
+    std::filesystem::create_symlink(target, folder.Path() / user);
     ASSERT_TRUE(sources.ReadUserFile(text));
     EXPECT_EQ(text, "ru_RU");
-
     std::filesystem::remove(target);
     ASSERT_EQ(::mkfifo(target.c_str(), 0600), 0);
     EXPECT_FALSE(sources.ReadUserFile(text));
@@ -183,17 +123,16 @@ TEST_F(LanguagePlacesTest, ALinkIsFollowedToAFileButNotToAFifo)
 TEST_F(LanguagePlacesTest, TheUserFolderFollowsXdgAndTheLocaleTheEnvironment)
 {
     EXPECT_EQ(wyxos::UserConfigFolder(), (folder.Path() / "config").string());
-    ::setenv("XDG_CONFIG_HOME", "relative/config", 1);
-    ::setenv("HOME", folder.Path().c_str(), 1);
+    ScopedEnv relative("XDG_CONFIG_HOME", "relative/config"), home("HOME", folder.Path().string());
     EXPECT_EQ(wyxos::UserConfigFolder(), (folder.Path() / ".config").string());
 
-    ::setenv("LANG", "fr_FR.UTF-8", 1);
-    ::setenv("LC_MESSAGES", "de_DE.UTF-8", 1);
-    ::setenv("LC_ALL", "", 1);
-    EXPECT_EQ(wyxos::UserMessagesLocaleName(), "de_DE.UTF-8");
-    EXPECT_EQ(uilanguage::SystemLanguageSources().SystemLanguageId(), 0x0407u);
-    ::setenv("LC_ALL", "C", 1);
-    EXPECT_EQ(uilanguage::SystemLanguageSources().SystemLanguageId(), 0u);
+    {
+        ScopedEnv lang("LANG", "fr_FR.UTF-8"), messages("LC_MESSAGES", "de_DE.UTF-8"), all("LC_ALL", "");
+        EXPECT_EQ(wyxos::UserMessagesLocaleName(), "de_DE.UTF-8");
+        EXPECT_EQ(uilanguage::SystemLanguageSources().SystemLanguageId(), 0x0407u);
+        ScopedEnv c("LC_ALL", "C");
+        EXPECT_EQ(uilanguage::SystemLanguageSources().SystemLanguageId(), 0u);
+    }
     for (const char* variable : {"LC_ALL", "LC_MESSAGES", "LANG"})
         ::unsetenv(variable);
     EXPECT_EQ(wyxos::UserMessagesLocaleName(), "C");
