@@ -1,10 +1,14 @@
 // Every image built into the program decodes to the size and kind its users
-// expect, and damaged data gives an invalid bitmap instead of a crash.
+// expect, damaged data gives an invalid bitmap instead of a crash, and the
+// window icon file lies beside the program.
 #include "resources/EmbeddedImages.h"
 #include "platform/ui/BitmapFromMemory.h"
 
 #include <gtest/gtest.h>
+#include <wx/filename.h>
+#include <wx/iconbndl.h>
 #include <wx/image.h>
+#include <wx/stdpaths.h>
 
 #include <string>
 #include <vector>
@@ -12,37 +16,6 @@
 namespace
 {
 using wyx::images::EmbeddedImage;
-
-enum class Kind
-{
-    Alpha,
-    MaskedOnMagenta,
-    Opaque
-};
-
-struct ImageCase
-{
-    std::string name;
-    const EmbeddedImage* image;
-    wxSize size;
-    Kind kind;
-};
-
-std::vector<ImageCase> AllImages()
-{
-    using namespace wyx::images;
-    std::vector<ImageCase> cases;
-    for (int i = 0; i < 12; ++i)
-        cases.push_back({"busyWheel" + std::to_string(i), &busyWheel[i], wxSize(16, 16), Kind::Alpha});
-    cases.push_back({"sortAscending", &sortMarks[0], wxSize(16, 16), Kind::MaskedOnMagenta});
-    cases.push_back({"sortDescending", &sortMarks[1], wxSize(16, 16), Kind::MaskedOnMagenta});
-    cases.push_back({"headerStrip", &headerStrip, wxSize(1, 23), Kind::Opaque});
-    cases.push_back({"warning", &warning, wxSize(16, 16), Kind::Alpha});
-    cases.push_back({"clearAll", &clearAll, wxSize(16, 16), Kind::Alpha});
-    for (int i = 0; i < 3; ++i)
-        cases.push_back({"tab" + std::to_string(i), &tabImages[i], wxSize(16, 16), Kind::Alpha});
-    return cases;
-}
 
 wxImage Decode(const EmbeddedImage& image)
 {
@@ -55,56 +28,55 @@ bool IsMagenta(const wxImage& image, int x, int y)
     return image.GetRed(x, y) == 255 && image.GetGreen(x, y) == 0 && image.GetBlue(x, y) == 255;
 }
 
-class EmbeddedImageDecoding : public ::testing::TestWithParam<ImageCase>
+TEST(EmbeddedImages, HaveTheirSizeAndKind)
 {
-};
-
-TEST_P(EmbeddedImageDecoding, HasItsSizeAndKind)
-{
-    const ImageCase& param = GetParam();
-    ASSERT_GT(param.image->length, 8u);
-    const wxBitmap bitmap = CUGetBitmapFromMemory(param.image->data, param.image->length);
-    ASSERT_TRUE(bitmap.IsOk());
-    EXPECT_EQ(bitmap.GetSize(), param.size);
-
-    const wxImage image = bitmap.ConvertToImage();
-    switch (param.kind)
+    using namespace wyx::images;
+    enum Kind
     {
-    case Kind::Alpha:
+        Alpha,
+        MaskedOnMagenta,
+        Opaque
+    };
+    struct Case
     {
-        ASSERT_TRUE(image.HasAlpha());
-        // Transparent corners, and something opaque to see.
-        EXPECT_EQ(image.GetAlpha(0, 0), 0);
-        bool anyOpaque = false;
-        for (int y = 0; y < image.GetHeight(); ++y)
-            for (int x = 0; x < image.GetWidth(); ++x)
-                anyOpaque = anyOpaque || image.GetAlpha(x, y) == 255;
-        EXPECT_TRUE(anyOpaque);
-        break;
-    }
-    case Kind::MaskedOnMagenta:
+        std::string name;
+        const EmbeddedImage& image;
+        wxSize size;
+        Kind kind;
+    };
+    std::vector<Case> cases = {{"sortAscending", sortMarks[0], {16, 16}, MaskedOnMagenta},
+                               {"sortDescending", sortMarks[1], {16, 16}, MaskedOnMagenta},
+                               {"headerStrip", headerStrip, {1, 23}, Opaque},
+                               {"warning", warning, {16, 16}, Alpha},
+                               {"clearAll", clearAll, {16, 16}, Alpha}};
+    for (int i = 0; i < 12; ++i)
+        cases.push_back({"busyWheel" + std::to_string(i), busyWheel[i], {16, 16}, Alpha});
+    for (int i = 0; i < 3; ++i)
+        cases.push_back({"tab" + std::to_string(i), tabImages[i], {16, 16}, Alpha});
+    for (const Case& c : cases)
     {
-        EXPECT_FALSE(image.HasAlpha());
-        EXPECT_TRUE(IsMagenta(image, 0, 0));
-        // With the magenta masked, what is left is the mark itself.
-        wxBitmap masked(bitmap);
-        masked.SetMask(new wxMask(masked, wxColour(255, 0, 255)));
-        const wxImage maskedImage = masked.ConvertToImage();
-        ASSERT_TRUE(maskedImage.HasMask());
-        EXPECT_TRUE(maskedImage.IsTransparent(0, 0));
-        EXPECT_FALSE(maskedImage.IsTransparent(7, 8));
-        break;
-    }
-    case Kind::Opaque:
-        EXPECT_FALSE(image.HasAlpha());
-        break;
+        SCOPED_TRACE(c.name);
+        const wxImage image = Decode(c.image);
+        ASSERT_TRUE(image.IsOk());
+        EXPECT_EQ(image.GetSize(), c.size);
+        EXPECT_EQ(image.HasAlpha(), c.kind == Alpha);
+        if (c.kind == Alpha)
+        {
+            // Transparent corners, and something opaque to see.
+            EXPECT_EQ(image.GetAlpha(0, 0), 0);
+            bool anyOpaque = false;
+            for (int y = 0; y < image.GetHeight(); ++y)
+                for (int x = 0; x < image.GetWidth(); ++x)
+                    anyOpaque = anyOpaque || image.GetAlpha(x, y) == 255;
+            EXPECT_TRUE(anyOpaque);
+        }
+        // The magenta is what a mask takes away; the mark itself is at the middle.
+        if (c.kind == MaskedOnMagenta)
+            EXPECT_TRUE(IsMagenta(image, 0, 0) && !IsMagenta(image, 7, 8));
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(All, EmbeddedImageDecoding, ::testing::ValuesIn(AllImages()),
-                         [](const ::testing::TestParamInfo<ImageCase>& info) { return info.param.name; });
-
-// Width of the mark in a row: the pixels that are not magenta.
+// The first and last rows that hold part of a sort mark, and the mark's width in a row.
 int MarkWidth(const wxImage& image, int y)
 {
     int width = 0;
@@ -113,43 +85,29 @@ int MarkWidth(const wxImage& image, int y)
     return width;
 }
 
-// The first and last rows that hold part of the mark.
-std::pair<int, int> MarkRows(const wxImage& image)
+TEST(EmbeddedImages, AscendingMarkPointsUpAndDescendingDown)
 {
-    int first = -1;
-    int last = -1;
-    for (int y = 0; y < image.GetHeight(); ++y)
+    for (int mark : {0, 1})
     {
-        if (MarkWidth(image, y) > 0)
-        {
-            first = first < 0 ? y : first;
-            last = y;
-        }
+        const wxImage image = Decode(wyx::images::sortMarks[mark]);
+        int top = -1, bottom = -1;
+        for (int y = 0; y < image.GetHeight(); ++y)
+            if (MarkWidth(image, y) > 0)
+            {
+                top = top < 0 ? y : top;
+                bottom = y;
+            }
+        ASSERT_LT(top, bottom) << mark;
+        EXPECT_EQ(MarkWidth(image, top) < MarkWidth(image, bottom), mark == 0) << mark;
     }
-    return {first, last};
 }
 
-TEST(SortMarks, AscendingPointsUpAndDescendingDown)
-{
-    const wxImage up = Decode(wyx::images::sortMarks[0]);
-    const wxImage down = Decode(wyx::images::sortMarks[1]);
-    ASSERT_TRUE(up.IsOk());
-    ASSERT_TRUE(down.IsOk());
-    const auto [upTop, upBottom] = MarkRows(up);
-    const auto [downTop, downBottom] = MarkRows(down);
-    ASSERT_LT(upTop, upBottom);
-    ASSERT_LT(downTop, downBottom);
-    EXPECT_LT(MarkWidth(up, upTop), MarkWidth(up, upBottom));
-    EXPECT_GT(MarkWidth(down, downTop), MarkWidth(down, downBottom));
-}
-
-TEST(BusyWheel, EveryFrameIsTurnedFromTheOneBefore)
+TEST(EmbeddedImages, EveryBusyWheelFrameIsTurnedFromTheOneBefore)
 {
     for (int i = 0; i < 12; ++i)
     {
         const wxImage frame = Decode(wyx::images::busyWheel[i]);
         const wxImage next = Decode(wyx::images::busyWheel[(i + 1) % 12]);
-        ASSERT_TRUE(frame.IsOk() && next.IsOk());
         int differing = 0;
         for (int y = 0; y < 16; ++y)
             for (int x = 0; x < 16; ++x)
@@ -163,28 +121,35 @@ TEST(BitmapFromMemory, DamagedDataGivesAnInvalidBitmap)
 {
     const EmbeddedImage& good = wyx::images::warning;
     const std::vector<unsigned char> png(good.data, good.data + good.length);
-    std::vector<unsigned char> corrupted = png;
-    for (size_t i = 33; i < corrupted.size(); i += 7)
-        corrupted[i] ^= 0x5A;
+    std::vector<unsigned char> scrambled = png;
+    for (size_t i = 33; i < scrambled.size(); i += 7)
+        scrambled[i] ^= 0x5A;
     const unsigned char text[] = "not an image at all";
-
-    struct Damaged
+    const struct
     {
         const char* what;
         const void* data;
         size_t length;
-    };
-    const Damaged cases[] = {
-        {"null", nullptr, 0},
-        {"null with a length", nullptr, 100},
-        {"empty", png.data(), 0},
-        {"signature only", png.data(), 8},
-        {"cut in half", png.data(), png.size() / 2},
-        {"scrambled body", corrupted.data(), corrupted.size()},
-        {"text", text, sizeof text},
-    };
-    for (const Damaged& damaged : cases)
+    } cases[] = {{"null", nullptr, 0},
+                 {"null with a length", nullptr, 100},
+                 {"empty", png.data(), 0},
+                 {"signature only", png.data(), 8},
+                 {"cut in half", png.data(), png.size() / 2},
+                 {"scrambled body", scrambled.data(), scrambled.size()},
+                 {"text", text, sizeof text}};
+    for (const auto& damaged : cases)
         EXPECT_FALSE(CUGetBitmapFromMemory(damaged.data, damaged.length).IsOk()) << damaged.what;
     EXPECT_TRUE(CUGetBitmapFromMemory(png.data(), png.size()).IsOk());
+}
+
+TEST(WindowIconFile, LiesBesideTheProgramWithItsSixteenThirtyTwoAndFortyEightPixelImages)
+{
+    wxFileName path(wxStandardPaths::Get().GetExecutablePath());
+    path.SetFullName("wyx_folder.ico");
+    const wxIconBundle bundle(path.GetFullPath(), wxBITMAP_TYPE_ANY);
+    ASSERT_TRUE(bundle.IsOk()) << path.GetFullPath();
+    EXPECT_EQ(bundle.GetIconCount(), 3u);
+    for (int size : {16, 32, 48})
+        EXPECT_EQ(bundle.GetIconOfExactSize(wxSize(size, size)).GetSize(), wxSize(size, size)) << size;
 }
 } // namespace
