@@ -14,168 +14,127 @@ namespace
 // Translations need wx's base library set up.
 const wxInitializer kWx;
 
-struct SizeCase
-{
-    const char* bytes;
-    const char* shown;
-};
+using Order = std::vector<std::size_t>;
 
-class FormatSizeRule : public ::testing::TestWithParam<SizeCase>
+TEST(ViewRules, FormatSizeShowsBytesInTheLargestUnitExceeded)
 {
-};
-
-TEST_P(FormatSizeRule, ShowsBytesInTheLargestUnitExceeded)
-{
-    EXPECT_EQ(FormatSize(GetParam().bytes), GetParam().shown);
+    for (const auto& [bytes, shown] : {std::pair{"2048", "2.00KB"},
+                                       {"0", "0.00KB"},
+                                       {"1048576", "1024.00KB"},
+                                       {"1048577", "1.00MB"},
+                                       {"1073741824", "1024.00MB"},
+                                       {"1073741825", "1.00GB"},
+                                       {"5368709120", "5.00GB"},
+                                       {"5497558138880", "5120.00GB"},
+                                       {"", ""},
+                                       {"N/A", "N/A"},
+                                       {"n/a", "n/a"},
+                                       {"lots", "0.00KB"},
+                                       {"nan", "0.00KB"}})
+        EXPECT_EQ(FormatSize(bytes), shown) << bytes;
 }
 
-INSTANTIATE_TEST_SUITE_P(Sizes, FormatSizeRule,
-                         ::testing::Values(SizeCase{"2048", "2.00KB"}, SizeCase{"0", "0.00KB"},
-                                           SizeCase{"1048576", "1024.00KB"}, SizeCase{"1048577", "1.00MB"},
-                                           SizeCase{"1073741824", "1024.00MB"}, SizeCase{"1073741825", "1.00GB"},
-                                           SizeCase{"5368709120", "5.00GB"},
-                                           SizeCase{"5497558138880", "5120.00GB"}, SizeCase{"", ""},
-                                           SizeCase{"N/A", "N/A"}, SizeCase{"n/a", "n/a"},
-                                           SizeCase{"lots", "0.00KB"}, SizeCase{"nan", "0.00KB"}));
-
-TEST(PathRules, NameTheFileAndTheFolderAsTheTableShowsThem)
+TEST(ViewRules, PathsNameTheFileAndTheFolderAsTheTableShowsThem)
 {
-    struct Case
-    {
-        const char* path;
-        const char* last;
-        const char* title;
-    };
-    for (const Case& c :
-         {Case{"/srv/in/Proofs/a.b.pdf", "a.b.pdf", "a.b"}, Case{"/srv/in/Proofs/", "Proofs", "Proofs"},
-          Case{"/srv/in/.profile", ".profile", ".profile"}, Case{"report", "report", "report"},
-          Case{"/", "", ""}, Case{"", "", ""}})
-    {
-        EXPECT_EQ(LastPathComponent(c.path), c.last) << c.path;
-        EXPECT_EQ(FileTitle(c.path), c.title) << c.path;
-    }
+    for (const auto& [path, last, title] : {std::tuple{"/srv/in/Proofs/a.b.pdf", "a.b.pdf", "a.b"},
+                                            {"/srv/in/Proofs/", "Proofs", "Proofs"},
+                                            {"/srv/in/.profile", ".profile", ".profile"},
+                                            {"report", "report", "report"},
+                                            {"/", "", ""},
+                                            {"", "", ""}})
+        EXPECT_EQ(LastPathComponent(path) + "|" + FileTitle(path), wxString(last) + "|" + title) << path;
 }
 
-TEST(FilterRules, MatchIgnoringCaseAndTrailingSpace)
+TEST(ViewRules, FiltersMatchIgnoringCaseAndTrailingSpaceAndMergeKeepsRespectingCase)
 {
     EXPECT_TRUE(SameFilterText("srv1", "SRV1 \t"));
     EXPECT_FALSE(SameFilterText(" srv1", "srv1"));
     EXPECT_FALSE(SameFilterText("srv1", "srv10"));
-}
-
-TEST(FilterRules, MergeAddsIgnoringCaseAndKeepsRespectingCase)
-{
     const wxString all = "All Servers      ";
-    struct Case
+    // entries, names, entries after (comma-separated, "All Servers" first in each).
+    for (const auto& [entries, names, expected] :
+         {std::tuple{"ABC", "abc", ""}, // abc is not added (ABC is there), and ABC goes (it is not abc)
+          {"", "srv1,srv2 ", "srv1,srv2"},
+          {"srv2,gone,srv1", "srv1,srv2,new", "srv2,srv1,new"},
+          {"srv1 ", "srv1", "srv1 "},
+          {"srv1", "", ""}})
     {
-        std::vector<const char*> entries;
-        std::vector<const char*> names;
-        std::vector<const char*> expected;
-    };
-    const Case cases[] = {
-        // abc is not added (ABC is there, ignoring case) and ABC goes (abc is not ABC).
-        {{"ABC"}, {"abc"}, {}},
-        {{}, {"srv1", "srv2 "}, {"srv1", "srv2"}},
-        {{"srv2", "gone", "srv1"}, {"srv1", "srv2", "new"}, {"srv2", "srv1", "new"}},
-        {{"srv1 "}, {"srv1"}, {"srv1 "}},
-        {{"srv1"}, {}, {}},
-    };
-    for (const Case& c : cases)
-    {
-        wxArrayString entries, names, expected;
-        entries.Add(all);
-        expected.Add(all);
-        for (const char* e : c.entries)
-            entries.Add(e);
-        for (const char* n : c.names)
-            names.Add(n);
-        for (const char* e : c.expected)
-            expected.Add(e);
-        EXPECT_EQ(MergeFilterEntries(entries, names, all), expected) << wxJoin(entries, ',');
+        const auto list = [&](const char* text, bool withAll)
+        {
+            wxArrayString items = wxSplit(text, ',', '\0');
+            if (*text == '\0')
+                items.clear();
+            if (withAll)
+                items.Insert(all, 0);
+            return items;
+        };
+        EXPECT_EQ(MergeFilterEntries(list(entries, true), list(names, false), all), list(expected, true))
+            << entries;
     }
 }
 
-TEST(FooterRules, CountAndSelectionInAnyOrderTheTranslationChooses)
+TEST(ViewRules, FootersCountSelectAndSayWhenTheJournalCouldNotBeRead)
 {
     EXPECT_EQ(CountFooter(3), "3 Items ");
     EXPECT_EQ(SelectionFooter("[WYX3Value1] of [WYX3Value2] items selected.", 1, 12),
               "1 of 12 items selected.");
     EXPECT_EQ(SelectionFooter("[WYX3Value2] Zeilen, [WYX3Value1] markiert", 1, 12), "12 Zeilen, 1 markiert");
     EXPECT_EQ(SelectionFooter("[WYX3Value1]/[WYX3Value1]", 2, 5), "2/[WYX3Value1]");
-}
 
-TEST(FooterRules, SayWhenTheJournalCouldNotBeReadAndWhenItCameBack)
-{
     const JournalNoticeTexts texts{"busy since %s", "cannot be read", "back since %s"};
     const std::time_t at = wxDateTime(6, wxDateTime::Dec, 2026, 10, 42).GetTicks();
     using State = JournalWatch::State;
-    struct Case
-    {
-        JournalWatch::Report report;
-        const char* notice;
-    };
-    for (const Case& c : {Case{{State::Busy, at, false}, "busy since 10:42"},
-                          Case{{State::Unreadable, at, false}, "cannot be read"},
-                          Case{{State::Readable, at, true}, "back since 10:42"}, Case{{State::Readable, 0, false}, ""}})
-        EXPECT_EQ(JournalNotice(c.report, texts), c.notice);
+    for (const auto& [report, notice] :
+         {std::pair{JournalWatch::Report{State::Busy, at, false}, "busy since 10:42"},
+          {{State::Unreadable, at, false}, "cannot be read"},
+          {{State::Readable, at, true}, "back since 10:42"},
+          {{State::Readable, 0, false}, ""}})
+        EXPECT_EQ(JournalNotice(report, texts), notice);
 }
 
-std::vector<std::size_t> TextOrder(std::vector<const char*> values, bool descending)
+Order SortOrder(std::vector<wxString> values, SortKind kind, bool descending)
 {
-    return SortKeys(values.size(), SortKind::Text, [&](std::size_t i) { return wxString(values[i]); })
-        .Order(descending);
+    return SortKeys(values.size(), kind, [&](std::size_t i) { return values[i]; }).Order(descending);
 }
 
-TEST(SortRules, TextIgnoresCaseAndEqualKeysKeepTheirOrder)
+TEST(ViewRules, SortsTextIgnoringCaseNumbersAsUnsignedAndTiesKeepTheirOrder)
 {
-    EXPECT_EQ(TextOrder({"b", "A", "a", "C"}, false), (std::vector<std::size_t>{1, 2, 0, 3}));
-    EXPECT_EQ(TextOrder({"b", "A", "a", "C"}, true), (std::vector<std::size_t>{3, 0, 1, 2}));
-    EXPECT_EQ(TextOrder({"Zulu", "apple", "ZEBRA"}, false), (std::vector<std::size_t>{1, 2, 0}));
-    const std::vector<wxString> accented = {wxString::FromUTF8("\xc3\xa9t\xc3\xa9"), "Zoo"};
-    EXPECT_EQ(SortKeys(2, SortKind::Text, [&](std::size_t i) { return accented[i]; }).Order(false),
-              (std::vector<std::size_t>{1, 0}));
-}
+    EXPECT_EQ(SortOrder({"b", "A", "a", "C"}, SortKind::Text, false), (Order{1, 2, 0, 3}));
+    EXPECT_EQ(SortOrder({"b", "A", "a", "C"}, SortKind::Text, true), (Order{3, 0, 1, 2}));
+    EXPECT_EQ(SortOrder({"Zulu", "apple", "ZEBRA"}, SortKind::Text, false), (Order{1, 2, 0}));
+    EXPECT_EQ(SortOrder({wxString::FromUTF8("\xc3\xa9t\xc3\xa9"), "Zoo"}, SortKind::Text, false),
+              (Order{1, 0}));
+    // Unreadable counts as zero; a number beyond 64 bits still sorts above.
+    EXPECT_EQ(SortOrder({"1383035055", "x", "99", "18446744073709551616999"}, SortKind::Number, true),
+              (Order{3, 0, 2, 1}));
 
-TEST(SortRules, NumbersReadAsUnsignedDecimalsAndUnreadableCountsAsZero)
-{
-    const std::vector<const char*> values = {"1383035055", "x", "99", "18446744073709551616999"};
-    const auto order =
-        SortKeys(values.size(), SortKind::Number, [&](std::size_t i) { return wxString(values[i]); })
-            .Order(true);
-    EXPECT_EQ(order, (std::vector<std::size_t>{3, 0, 2, 1}));
-}
-
-TEST(SortRules, ApplyOrderRearrangesWholeRecords)
-{
     std::vector<JobRecord> records(4);
     for (std::size_t i = 0; i < records.size(); ++i)
         records[i].fill(wxString::Format("r%zu", i));
     ApplyOrder(records, {2, 0, 3, 1});
-    for (const auto& [at, from] : {std::pair{0, 2}, {1, 0}, {2, 3}, {3, 1}})
-        EXPECT_EQ(records[at][7], wxString::Format("r%d", from)) << at;
+    EXPECT_EQ(records[0][7] + records[1][0] + records[2][3] + records[3][7], "r2r0r3r1");
 }
 
-TEST(SortRules, EachColumnKeepsItsOwnAlternation)
+TEST(ViewRules, EachColumnKeepsItsOwnAlternationAndOthersAreRefused)
 {
     ColumnSortState state(7, 1, false);
-    struct Click
+    // column clicked, accepted, then the sorted column and whether it descends.
+    for (const auto& [column, accepted, sorted, descending] : {std::tuple{4, true, 4, true},
+                                                               {2, true, 2, true},
+                                                               {4, true, 4, false},
+                                                               {0, false, 4, false},
+                                                               {-1, false, 4, false},
+                                                               {8, false, 4, false},
+                                                               {4, true, 4, true},
+                                                               {1, true, 1, true}})
     {
-        int column;
-        bool accepted;
-        int sorted;
-        bool descending;
-    };
-    for (const Click& click : {Click{4, true, 4, true}, Click{2, true, 2, true}, Click{4, true, 4, false},
-                               Click{0, false, 4, false}, Click{-1, false, 4, false},
-                               Click{8, false, 4, false}, Click{4, true, 4, true}, Click{1, true, 1, true}})
-    {
-        EXPECT_EQ(state.Click(click.column), click.accepted) << click.column;
-        EXPECT_EQ(state.Column(), click.sorted) << click.column;
-        EXPECT_EQ(state.Descending(), click.descending) << click.column;
+        EXPECT_EQ(state.Click(column), accepted) << column;
+        EXPECT_EQ(state.Column(), sorted) << column;
+        EXPECT_EQ(state.Descending(), descending) << column;
     }
 }
 
-TEST(WidthRules, ScaleWithTheFontButNeverNarrower)
+TEST(ViewRules, WidthsScaleWithTheFontButNeverNarrower)
 {
     EXPECT_EQ(ScaleColumnWidth(145, 6.5), 145);
     EXPECT_EQ(ScaleColumnWidth(145, 5.0), 145);
@@ -189,12 +148,17 @@ JobRecord Job(const char* key, const char* file, const char* server, const char*
             status};
 }
 
-std::vector<JobRecord> Shown(const StatusRows& rows)
+// One field of every shown row, joined.
+wxString Shown(const StatusRows& rows, int field = 0)
 {
-    std::vector<JobRecord> made(rows.GetRowCount());
-    for (std::size_t i = 0; i < made.size(); ++i)
-        rows.MakeRow(i, made[i]);
-    return made;
+    wxString joined;
+    JobRecord row;
+    for (std::size_t i = 0; i < rows.GetRowCount(); ++i)
+    {
+        rows.MakeRow(i, row);
+        joined << row[field] << ",";
+    }
+    return joined;
 }
 
 TEST(StatusTable, ShowsDisplayRowsInSortOrderForTheChosenServer)
@@ -205,24 +169,19 @@ TEST(StatusTable, ShowsDisplayRowsInSortOrderForTheChosenServer)
     read->startTimes = {30, 10, 20};
     StatusTable table;
     table.Replace(read);
-    const std::vector<JobRecord> unsorted = Shown(*table.Rows(false, wxString()));
-    ASSERT_EQ(unsorted.size(), 3u);
-    EXPECT_EQ(unsorted[1][0] + unsorted[2][0], "23") << "journal order until sorted";
+    EXPECT_EQ(Shown(*table.Rows(false, wxString())), "1,2,3,") << "journal order until sorted";
 
     table.Sort(1, false);
-    std::vector<JobRecord> rows = Shown(*table.Rows(false, wxString()));
-    ASSERT_EQ(rows.size(), 3u);
-    EXPECT_EQ(rows[0], (JobRecord{"2", "A", "Proofs", "srv2", "N/A", "PDF", "12/06/26", "Queued"}));
-    EXPECT_EQ(rows[1][1], "b");
-    EXPECT_EQ(rows[1][4], "2.00KB");
-    EXPECT_EQ(rows[2][4], "1.00MB");
+    const auto rows = table.Rows(false, wxString());
+    JobRecord first;
+    rows->MakeRow(0, first);
+    EXPECT_EQ(first, (JobRecord{"2", "A", "Proofs", "srv2", "N/A", "PDF", "12/06/26", "Queued"}));
+    EXPECT_EQ(Shown(*rows, 1), "A,b,c,");
+    EXPECT_EQ(Shown(*rows, 4), "N/A,2.00KB,1.00MB,");
 
     table.Sort(6, true); // Time: latest start first
     const auto srv1 = table.Rows(true, "srv1");
-    rows = Shown(*srv1);
-    ASSERT_EQ(rows.size(), 2u);
-    EXPECT_EQ(rows[0][0], "1");
-    EXPECT_EQ(rows[1][0], "3");
+    EXPECT_EQ(Shown(*srv1), "1,3,");
     EXPECT_EQ(srv1->FindKey("3"), 1);
     EXPECT_EQ(srv1->FindKey("2"), -1) << "filtered out";
 
@@ -231,8 +190,6 @@ TEST(StatusTable, ShowsDisplayRowsInSortOrderForTheChosenServer)
 
     table.Replace(std::make_shared<JobSnapshot>());
     EXPECT_EQ(table.Size(), 0u);
-    EXPECT_EQ(srv1->GetRowCount(), 2u) << "rows handed out keep their jobs";
-    EXPECT_EQ(Shown(*srv1)[1][0], "3");
+    EXPECT_EQ(Shown(*srv1), "1,3,") << "rows handed out keep their jobs";
 }
-
 } // namespace
