@@ -25,8 +25,8 @@
 
 namespace
 {
-
 using logtest::LogLine;
+using Texts = std::vector<wxString>;
 
 // Answers the message boxes in place of a person and notes what they said.
 class DialogScript : public wxModalDialogHook
@@ -35,7 +35,7 @@ public:
     explicit DialogScript(std::deque<int> answers) : answers(std::move(answers)) { Register(); }
     ~DialogScript() override { Unregister(); }
 
-    std::vector<wxString> messages;
+    Texts messages;
 
 protected:
     int Enter(wxDialog* dialog) override
@@ -71,45 +71,51 @@ protected:
         frame = new wxFrame(nullptr, wxID_ANY, "log", wxPoint(0, 0), wxSize(1000, 600));
         view = new JobLogView(frame, wxID_ANY, model);
         frame->Show();
-        guitest::Pump();
+        ASSERT_TRUE(guitest::PumpUntil([this] { return List()->GetMainWindow()->GetClientSize().y > 100; }));
     }
     void TearDown() override
     {
         frame->Destroy();
-        guitest::Pump();
+        guitest::Pump(10);
     }
 
     static wxString Marker(const wxString& folder) { return folder + "/[_KELVO_HotFolder_]/Error.er"; }
 
-    // Appends journal lines and lets the poll and the view do their part.
+    // Appends journal lines, polls, and hands the view its update event.
     void Produce(const wxString& lines)
     {
         logtest::SystemRoot::AppendFile(root.JournalPath(), lines);
         model.Refresh();
-        guitest::Pump();
+        wxTheApp->ProcessPendingEvents();
     }
 
-    std::vector<wxString> Column(int column) const
+    Texts Column(int column) const
     {
-        std::vector<wxString> texts;
+        Texts texts;
         for (long row = 0; row < List()->GetItemCount(); ++row)
             texts.push_back(List()->GetItemText(row, column));
         return texts;
     }
+    void Select(long row, bool on = true)
+    {
+        List()->SetItemState(row, on ? wxLIST_STATE_SELECTED : 0, wxLIST_STATE_SELECTED);
+        wxTheApp->ProcessPendingEvents();
+    }
+    void Send(wxEvent& event) { List()->GetEventHandler()->ProcessEvent(event); }
 
     ProfilesKelvoProfilesListCtrl* List() const { return view->GetLogList(); }
     wxString Footer() const { return view->GetFooter()->GetStatusText(0); }
     bool DetailShown() const { return view->GetErrorPanel()->IsShown(); }
+    wxRadioButton* Radio(wxWindowID id) const { return wxDynamicCast(view->FindWindow(id), wxRadioButton); }
 
     void Choose(wxWindowID radio)
     {
-        auto* button = wxDynamicCast(view->FindWindow(radio), wxRadioButton);
-        button->SetValue(true);
+        Radio(radio)->SetValue(true);
         wxCommandEvent event(wxEVT_RADIOBUTTON, radio);
-        event.SetEventObject(button);
+        event.SetEventObject(Radio(radio));
         event.SetInt(1);
-        button->GetEventHandler()->ProcessEvent(event);
-        guitest::Pump();
+        Radio(radio)->GetEventHandler()->ProcessEvent(event);
+        wxTheApp->ProcessPendingEvents();
     }
 
     // As the button reports a press: queued to the view, with the button's id.
@@ -117,14 +123,21 @@ protected:
     {
         view->GetEventHandler()->QueueEvent(
             new wxCommandEvent(wxEVT_IMAGE_TEXT_BUTTON_CLICK, JobLogView::kClearAllId));
+        wxTheApp->ProcessPendingEvents();
     }
-
     void WaitForClear()
     {
-        for (int round = 0; round < 3000 && view->IsClearing(); ++round)
-            guitest::Pump(10);
-        ASSERT_FALSE(view->IsClearing());
-        guitest::Pump();
+        ASSERT_TRUE(guitest::PumpUntil([this] { return !view->IsClearing(); }));
+    }
+
+    // What a clear must leave alone: rows, footer, detail, records, journal and markers.
+    wxString Kept() const
+    {
+        return wxJoin(wxArrayString(Column(1).size(), Column(1).data()), ',') + "|" + Footer() + "|" +
+               (DetailShown() ? "detail" : "") +
+               wxString::Format("|%zu|%d|", model.GetRecordCount(),
+                                wxFileName::GetSize(root.JournalPath()) > 0) +
+               (wxFileExists(Marker(folders[0])) ? "marked" : "");
     }
 
     logtest::SystemRoot root;
@@ -138,33 +151,29 @@ TEST_F(LogView, JournalLinesBecomeRowsAtTheEndWhateverTheSort)
 {
     Produce(LogLine("a", "ADDED", "Transferred Successfully", folders[0]) +
             LogLine("b", "ADDED", "Failed", folders[1]));
-    ASSERT_EQ((std::vector<wxString>{"a", "b"}), Column(1));
-
+    ASSERT_EQ(Column(1), (Texts{"a", "b"}));
     // The first click on "File Name" sorts descending.
     wxListEvent click(wxEVT_LIST_COL_CLICK, JobLogView::kLogListId);
     click.m_col = 1;
-    List()->GetEventHandler()->ProcessEvent(click);
-    ASSERT_EQ((std::vector<wxString>{"b", "a"}), Column(1));
+    Send(click);
+    ASSERT_EQ(Column(1), (Texts{"b", "a"}));
 
     // Two polls before the view's turn: two updates queued, each row once.
     logtest::SystemRoot::AppendFile(root.JournalPath(), LogLine("c", "ADDED", "Failed", folders[0]));
     model.Refresh();
-    logtest::SystemRoot::AppendFile(root.JournalPath(), LogLine("d", "ADDED", "Failed", folders[1]));
-    model.Refresh();
-    guitest::Pump();
-
-    EXPECT_EQ((std::vector<wxString>{"b", "a", "c", "d"}), Column(1));
-    EXPECT_EQ((std::vector<wxString>{"Out", "In", "In", "Out"}), Column(2));
-    EXPECT_EQ((std::vector<wxString>{"Failed", "Transferred Successfully", "Failed", "Failed"}), Column(5));
-    wxListItem warning;
-    warning.SetId(1);
-    warning.SetMask(wxLIST_MASK_IMAGE);
-    ASSERT_TRUE(List()->GetItem(warning));
-    EXPECT_EQ(kCellImageNone, warning.GetImage());
-    warning.SetId(2);
-    ASSERT_TRUE(List()->GetItem(warning));
-    EXPECT_EQ(0, warning.GetImage());
-    EXPECT_EQ("4 Items", Footer());
+    Produce(LogLine("d", "ADDED", "Failed", folders[1]));
+    EXPECT_EQ(Column(1), (Texts{"b", "a", "c", "d"}));
+    EXPECT_EQ(Column(2), (Texts{"Out", "In", "In", "Out"}));
+    EXPECT_EQ(Column(5), (Texts{"Failed", "Transferred Successfully", "Failed", "Failed"}));
+    for (const auto& [row, image] : {std::pair{1, int(kCellImageNone)}, {2, 0}})
+    {
+        wxListItem warning;
+        warning.SetId(row);
+        warning.SetMask(wxLIST_MASK_IMAGE);
+        ASSERT_TRUE(List()->GetItem(warning));
+        EXPECT_EQ(warning.GetImage(), image) << row;
+    }
+    EXPECT_EQ(Footer(), "4 Items");
 }
 
 TEST_F(LogView, ErrorLogHidesSuccessesAndAcknowledgesTheShownFolders)
@@ -172,20 +181,19 @@ TEST_F(LogView, ErrorLogHidesSuccessesAndAcknowledgesTheShownFolders)
     Produce(LogLine("ok", "ADDED", "Transferred Successfully", folders[0]) +
             LogLine("ok2", "ADDED", "Transferred Successfully  ", folders[1]) +
             LogLine("case", "ADDED", "transferred successfully", folders[1]));
-    ASSERT_EQ(3, List()->GetItemCount());
+    ASSERT_EQ(List()->GetItemCount(), 3);
     EXPECT_TRUE(wxFileExists(Marker(folders[0])));
 
     Choose(JobLogView::kErrorLogId);
-    EXPECT_EQ((std::vector<wxString>{"case"}), Column(1));
-    EXPECT_FALSE(wxDynamicCast(view->FindWindow(JobLogView::kCompleteLogId), wxRadioButton)->GetValue());
+    EXPECT_EQ(Column(1), (Texts{"case"}));
+    EXPECT_FALSE(Radio(JobLogView::kCompleteLogId)->GetValue());
     // Every folder of the log, even one with successes only; not the idle one.
-    EXPECT_FALSE(wxFileExists(Marker(folders[0])));
-    EXPECT_FALSE(wxFileExists(Marker(folders[1])));
-    EXPECT_TRUE(wxFileExists(Marker(folders[2])));
+    for (int i = 0; i < 3; ++i)
+        EXPECT_EQ(wxFileExists(Marker(folders[i])), i == 2) << folders[i];
 
     Choose(JobLogView::kCompleteLogId);
-    EXPECT_EQ(3, List()->GetItemCount());
-    EXPECT_FALSE(wxDynamicCast(view->FindWindow(JobLogView::kErrorLogId), wxRadioButton)->GetValue());
+    EXPECT_EQ(List()->GetItemCount(), 3);
+    EXPECT_FALSE(Radio(JobLogView::kErrorLogId)->GetValue());
 }
 
 TEST_F(LogView, DetailPanelShowsOnlyWhileAFailedRowIsSelected)
@@ -193,34 +201,29 @@ TEST_F(LogView, DetailPanelShowsOnlyWhileAFailedRowIsSelected)
     Produce(LogLine("ok", "ADDED", "Transferred Successfully", folders[0]) +
             LogLine("bad", "ADDED", "Failed", folders[0]));
     ASSERT_FALSE(DetailShown());
-
-    List()->SetItemState(1, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-    guitest::Pump();
+    Select(1);
     EXPECT_TRUE(DetailShown());
-    EXPECT_EQ("detail of bad", view->GetErrorPanel()->GetErrorText());
+    EXPECT_EQ(view->GetErrorPanel()->GetErrorText(), "detail of bad");
     EXPECT_GT(view->GetErrorPanel()->GetSize().GetHeight(), 0);
-    EXPECT_EQ("1 of 2 items selected.", Footer());
+    EXPECT_EQ(Footer(), "1 of 2 items selected.");
     Produce(LogLine("later", "ADDED", "Transferred Successfully", folders[0]));
     EXPECT_TRUE(DetailShown()) << "a job finishing meanwhile leaves the detail being read";
-    EXPECT_EQ("1 of 3 items selected.", Footer());
+    EXPECT_EQ(Footer(), "1 of 3 items selected.");
 
-    List()->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-    guitest::Pump();
+    Select(0);
     EXPECT_FALSE(DetailShown());
-
-    // Events for no row in particular, and a click beside the last column.
+    // Events for no row in particular (index -1), and a click beside the last column.
     wxListEvent many(wxEVT_LIST_ITEM_SELECTED, JobLogView::kLogListId);
     many.m_itemIndex = -1;
-    List()->GetEventHandler()->ProcessEvent(many);
+    Send(many);
     wxListEvent beside(wxEVT_LIST_COL_CLICK, JobLogView::kLogListId);
     beside.m_col = -2;
-    List()->GetEventHandler()->ProcessEvent(beside);
+    Send(beside);
     EXPECT_FALSE(DetailShown());
-    EXPECT_EQ((std::vector<wxString>{"ok", "bad", "later"}), Column(1));
+    EXPECT_EQ(Column(1), (Texts{"ok", "bad", "later"}));
 
-    List()->SetItemState(0, 0, wxLIST_STATE_SELECTED);
-    guitest::Pump();
-    EXPECT_EQ("3 Items", Footer());
+    Select(0, false);
+    EXPECT_EQ(Footer(), "3 Items");
 }
 
 TEST_F(LogView, ColumnsShowTheLongestTextsWhole)
@@ -230,90 +233,64 @@ TEST_F(LogView, ColumnsShowTheLongestTextsWhole)
     const unsigned long time = (23 << 11) | (58 << 5) | (58 / 2);
     Produce("k\t" + folders[0] + "\t" + folders[0] + "/k.pdf\tPRN-01\t" +
             wxString::Format("%lu", (date << 16) | time) + "\tTransferred Successfully\tdone\tADDED\r\n");
-    ASSERT_EQ(1, List()->GetItemCount());
-
+    ASSERT_EQ(List()->GetItemCount(), 1);
     // The list draws a cell's text shortened when it is wider than the column less 8.
-    wxWindow* rows = List()->GetMainWindow();
     for (const int column : {4, 5})
     {
         const wxString text = List()->GetItemText(0, column);
-        EXPECT_LE(rows->GetTextExtent(text).GetWidth(), List()->GetColumnWidth(column) - 8)
+        EXPECT_LE(List()->GetMainWindow()->GetTextExtent(text).GetWidth(), List()->GetColumnWidth(column) - 8)
             << text << " in a column " << List()->GetColumnWidth(column) << " wide";
     }
 }
 
-TEST_F(LogView, ClearAllOfAnEmptyLogAsksNothing)
+TEST_F(LogView, ClearAllAsksNothingOfAnEmptyLogAndAnsweredNoChangesNothing)
 {
-    DialogScript script({});
-    PressClearAll();
-    guitest::Pump();
-    EXPECT_TRUE(script.messages.empty());
-    EXPECT_FALSE(view->IsClearing());
-}
-
-TEST_F(LogView, ClearAllAnsweredNoChangesNothing)
-{
+    {
+        DialogScript script({});
+        PressClearAll();
+        EXPECT_TRUE(script.messages.empty());
+    }
     Produce(LogLine("bad", "ADDED", "Failed", folders[0]));
+    const wxString before = Kept();
     DialogScript script({wxID_NO});
     PressClearAll();
-    guitest::Pump();
-
-    EXPECT_EQ((std::vector<wxString>{kConfirmation}), script.messages);
+    EXPECT_EQ(script.messages, (Texts{kConfirmation}));
     EXPECT_FALSE(view->IsClearing());
-    EXPECT_EQ(1, List()->GetItemCount());
-    EXPECT_GT(wxFileName::GetSize(root.JournalPath()), 0);
-    EXPECT_TRUE(wxFileExists(Marker(folders[0])));
+    EXPECT_EQ(Kept(), before);
 }
 
-TEST_F(LogView, ClearAllWhileTheProducerHoldsTheLogChangesNothingAndSaysSo)
+TEST_F(LogView, ClearAllWhileTheProducerHoldsTheLogChangesNothingAndSaysSoThenClearsOnceFree)
 {
     Produce(LogLine("bad", "ADDED", "Failed", folders[0]) +
             LogLine("ok", "ADDED", "Transferred Successfully"));
-    List()->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-    guitest::Pump();
-    const wxString footer = Footer();
+    Select(0);
+    const wxString before = Kept();
+    ASSERT_EQ(before, "bad,ok|1 of 2 items selected.|detail|2|1|marked");
     named_mutex_lock producer("TiveraJobsLogFile");
     ASSERT_TRUE(producer.try_lock());
+    {
+        DialogScript script({wxID_YES, wxID_OK});
+        PressClearAll();
+        // The wait for the lock does not hold up the window: it is still handling
+        // events while the producer keeps the lock.
+        EXPECT_TRUE(view->IsClearing());
+        EXPECT_EQ(script.messages, (Texts{kConfirmation}));
+        WaitForClear();
+        EXPECT_EQ(script.messages, (Texts{kConfirmation, kInUse}));
+        EXPECT_EQ(Kept(), before);
+    }
 
-    DialogScript script({wxID_YES, wxID_OK});
-    PressClearAll();
-    guitest::Pump();
-    // The wait for the lock does not hold up the window: it is still handling
-    // events while the producer keeps the lock.
-    EXPECT_TRUE(view->IsClearing());
-    EXPECT_EQ((std::vector<wxString>{kConfirmation}), script.messages);
-    WaitForClear();
-
-    EXPECT_EQ((std::vector<wxString>{kConfirmation, kInUse}), script.messages);
-    EXPECT_EQ((std::vector<wxString>{"bad", "ok"}), Column(1));
-    EXPECT_EQ(footer, Footer());
-    EXPECT_TRUE(DetailShown());
-    EXPECT_EQ(2u, model.GetRecordCount());
-    EXPECT_GT(wxFileName::GetSize(root.JournalPath()), 0);
-    EXPECT_TRUE(wxFileExists(Marker(folders[0])));
-}
-
-TEST_F(LogView, ClearAllAnsweredYesEmptiesJournalRowsAndMarkers)
-{
-    Produce(LogLine("bad", "ADDED", "Failed", folders[0]) +
-            LogLine("ok", "ADDED", "Transferred Successfully"));
-    List()->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-    guitest::Pump();
+    producer.unlock();
     DialogScript script({wxID_YES});
     PressClearAll();
     WaitForClear();
-
-    EXPECT_EQ((std::vector<wxString>{kConfirmation}), script.messages);
-    EXPECT_EQ(0, List()->GetItemCount());
-    EXPECT_EQ("0 Items ", Footer());
-    EXPECT_FALSE(DetailShown());
-    EXPECT_EQ(0, wxFileName::GetSize(root.JournalPath()));
+    EXPECT_EQ(script.messages, (Texts{kConfirmation}));
+    EXPECT_EQ(Kept(), "|0 Items ||0|0|");
     for (const wxString& folder : folders)
         EXPECT_FALSE(wxFileExists(Marker(folder))) << folder;
-
     // The next job after the clear is listed alone.
     Produce(LogLine("next", "ADDED"));
-    EXPECT_EQ((std::vector<wxString>{"next"}), Column(1));
+    EXPECT_EQ(Column(1), (Texts{"next"}));
 }
 
 TEST_F(LogView, ViewClosedWhileAClearWaitsGetsNoResult)
@@ -323,14 +300,13 @@ TEST_F(LogView, ViewClosedWhileAClearWaitsGetsNoResult)
     ASSERT_TRUE(producer.try_lock());
     DialogScript script({wxID_YES});
     PressClearAll();
-    guitest::Pump();
     ASSERT_TRUE(view->IsClearing());
 
     frame->Destroy();
-    guitest::Pump();
+    ASSERT_TRUE(guitest::PumpUntil([&] { return !wxTheApp->IsScheduledForDestruction(frame); }));
+    wxTheApp->ProcessPendingEvents();
     // The result died with the view: no "in use" box for a window that is gone.
-    EXPECT_EQ((std::vector<wxString>{kConfirmation}), script.messages);
+    EXPECT_EQ(script.messages, (Texts{kConfirmation}));
     frame = new wxFrame(nullptr, wxID_ANY, "after");
 }
-
 } // namespace

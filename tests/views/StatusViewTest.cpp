@@ -20,7 +20,6 @@
 
 namespace
 {
-
 // One journal line: the key names the file, DosTime orders the jobs by start.
 wxString Line(const wxString& key, const wxString& server, const wxString& status = "Queued",
               const wxString& dosTime = "1383035055", const wxString& size = "48213")
@@ -35,6 +34,8 @@ bool SameImage(const wxImage& a, const wxImage& b)
            memcmp(a.GetData(), b.GetData(), static_cast<size_t>(a.GetWidth() * a.GetHeight() * 3)) == 0;
 }
 
+using Texts = std::vector<wxString>;
+
 class StatusView : public ::testing::Test
 {
 protected:
@@ -45,25 +46,25 @@ protected:
         frame = new wxFrame(nullptr, wxID_ANY, "status", wxPoint(0, 0), wxSize(1100, 500));
         view = new JobStatusView(frame, wxID_ANY, model);
         frame->Show();
-        guitest::Pump();
+        ASSERT_TRUE(guitest::PumpUntil([this] { return List()->GetMainWindow()->GetClientSize().y > 100; }));
     }
     void TearDown() override
     {
         frame->Destroy();
-        guitest::Pump();
+        guitest::Pump(10);
     }
 
-    // Rewrites the journal and lets the poll and the view do their part.
+    // Rewrites the journal, polls, and hands the view its update event.
     void Produce(const wxString& lines)
     {
         statustest::SystemRoot::WriteFile(root.JournalPath(), lines);
         ASSERT_EQ(model.Refresh(), 1);
-        guitest::Pump();
+        wxTheApp->ProcessPendingEvents();
     }
 
-    std::vector<wxString> Column(long column) const
+    Texts Column(long column) const
     {
-        std::vector<wxString> texts;
+        Texts texts;
         for (long row = 0; row < List()->GetItemCount(); ++row)
             texts.push_back(List()->OnGetItemText(row, column));
         return texts;
@@ -83,10 +84,14 @@ protected:
         event.m_col = column;
         List()->GetEventHandler()->ProcessEvent(event);
     }
-    void ChooseServer(const wxString& entry)
+    void PressServerBox()
     {
         wxCommandEvent press(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK);
         view->ProcessWindowEvent(press);
+    }
+    void ChooseServer(const wxString& entry)
+    {
+        PressServerBox();
         const int index = view->GetServerBox()->FindString(entry, true);
         ASSERT_NE(index, wxNOT_FOUND) << entry;
         view->GetServerBox()->SetSelection(index);
@@ -100,10 +105,9 @@ protected:
         wxTimerEvent tick(timer);
         view->ProcessWindowEvent(tick);
     }
-    // What the rows window shows on the display once the toolkit has painted.
+    // What the rows window shows on the display.
     wxImage Screen() const
     {
-        guitest::Pump();
         ProfilesKelvoListMainWindow* rows = List()->GetMainWindow();
         return GrabScreen(wxRect(rows->GetScreenPosition(), rows->GetClientSize()));
     }
@@ -122,27 +126,30 @@ TEST_F(StatusView, JournalChangesReachTheRowsAndTheFooterInFileNameOrder)
     EXPECT_EQ(Footer(), "0 Items ");
     EXPECT_EQ(Mark(1), 0) << "File Name is sorted ascending before any click";
     Produce(Line("b", "srv1") + Line("C", "srv1", "Saving...") + Line("a", "srv2"));
-    EXPECT_EQ(Column(1), (std::vector<wxString>{"a", "b", "C"}));
-    EXPECT_EQ(Column(0), (std::vector<wxString>{"1", "2", "3"}));
+    EXPECT_EQ(Column(1), (Texts{"a", "b", "C"}));
+    EXPECT_EQ(Column(0), (Texts{"1", "2", "3"}));
     EXPECT_EQ(Footer(), "3 Items ");
-
     Produce(Line("b", "srv1"));
-    EXPECT_EQ(Column(1), (std::vector<wxString>{"b"}));
+    EXPECT_EQ(Column(1), (Texts{"b"}));
     EXPECT_EQ(Footer(), "1 Items ");
 }
 
-TEST_F(StatusView, ServerFilterHidesOtherServersAndAllServersRestoresThem)
+TEST_F(StatusView, TheServerListFollowsTheDataSourceAndTheFilterHoldsAcrossUpdates)
 {
+    PressServerBox();
+    EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv1,srv2,SRV3", ','));
+    statustest::SystemRoot::WriteFile(GetDataDirectory() + "HotFolders.ini", "[Servers]\nsrv1\nsrv2\n");
+    PressServerBox();
+    EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv1,srv2", ','));
+
     Produce(Line("a", "srv1") + Line("b", "SRV1 ") + Line("c", "srv2"));
     ChooseServer("srv1");
-    EXPECT_EQ(Column(1), (std::vector<wxString>{"a", "b"}));
+    EXPECT_EQ(Column(1), (Texts{"a", "b"}));
     EXPECT_EQ(Footer(), "2 Items ");
-
     Produce(Line("a", "srv1") + Line("d", "srv2"));
-    EXPECT_EQ(Column(1), (std::vector<wxString>{"a"})) << "the filter holds across updates";
-
+    EXPECT_EQ(Column(1), (Texts{"a"})) << "the filter holds across updates";
     ChooseServer("All Servers      ");
-    EXPECT_EQ(Column(1), (std::vector<wxString>{"a", "d"}));
+    EXPECT_EQ(Column(1), (Texts{"a", "d"}));
     EXPECT_EQ(Footer(), "2 Items ");
 }
 
@@ -151,24 +158,20 @@ TEST_F(StatusView, ColumnClicksFlipTheOrderAndTheMarkAndTimeSortsByStart)
     Produce(Line("a", "srv2", "Queued", "1383035100") + Line("b", "srv3", "Queued", "1383035000") +
             Line("c", "srv1", "Queued", "1383036000"));
     ClickColumn(4);
-    EXPECT_EQ(Column(4), (std::vector<wxString>{"srv3", "srv2", "srv1"}));
+    EXPECT_EQ(Column(4), (Texts{"srv3", "srv2", "srv1"}));
     EXPECT_EQ(Mark(4), 1);
     EXPECT_EQ(Mark(1), -1);
-    ClickColumn(4);
-    EXPECT_EQ(Column(4), (std::vector<wxString>{"srv1", "srv2", "srv3"}));
-    EXPECT_EQ(Mark(4), 0);
-
-    for (int ignored : {0, -1})
+    // A second click flips; negative and zero columns sort nothing.
+    for (int column : {4, 0, -1})
     {
-        ClickColumn(ignored);
-        EXPECT_EQ(Column(4), (std::vector<wxString>{"srv1", "srv2", "srv3"})) << ignored;
-        EXPECT_EQ(Mark(4), 0) << ignored;
+        ClickColumn(column);
+        EXPECT_EQ(Column(4), (Texts{"srv1", "srv2", "srv3"})) << column;
+        EXPECT_EQ(Mark(4), 0) << column;
     }
-
     ClickColumn(6);
-    EXPECT_EQ(Column(1), (std::vector<wxString>{"c", "a", "b"})) << "latest start first";
+    EXPECT_EQ(Column(1), (Texts{"c", "a", "b"})) << "latest start first";
     Produce(Line("a", "srv2", "Queued", "1383035100") + Line("d", "srv1", "Queued", "1383099000"));
-    EXPECT_EQ(Column(1), (std::vector<wxString>{"d", "a"})) << "an update keeps the sort";
+    EXPECT_EQ(Column(1), (Texts{"d", "a"})) << "an update keeps the sort";
 }
 
 TEST_F(StatusView, TheSelectedJobStaysSelectedUntilItLeaves)
@@ -185,34 +188,30 @@ TEST_F(StatusView, TheSelectedJobStaysSelectedUntilItLeaves)
     EXPECT_EQ(Selected(), -1) << "a job that left the journal left the selection";
 }
 
-TEST_F(StatusView, ServerListFollowsTheDataSourceAndKeepsAllServers)
-{
-    wxCommandEvent press(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK);
-    view->ProcessWindowEvent(press);
-    EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv1,srv2,SRV3", ','));
-    statustest::SystemRoot::WriteFile(GetDataDirectory() + "HotFolders.ini", "[Servers]\nsrv2\n");
-    view->ProcessWindowEvent(press);
-    EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv2", ','));
-}
-
 TEST_F(StatusView, ATickTurnsTheWheelOfRowsInProgressOnly)
 {
     Produce(Line("a", "srv1", "Saving...") + Line("b", "srv1", "Queued") + Line("c", "srv1", "saving...") +
             Line("d", "srv1", "Transferring to server"));
-    Tick(); // the first tick shows the frame the rows started with
-    const wxImage before = Screen();
-    Tick();
-    const wxImage after = Screen();
-    ASSERT_TRUE(before.IsOk() && after.IsOk());
-
     const int lineHeight = List()->GetMainWindow()->GetLineHeight();
     wxRect status;
     List()->GetSubItemRect(0, 7, status);
+    const auto wheel = [&](long row) { return wxRect(status.x, row * lineHeight, 18, lineHeight); };
+    Tick();          // the first tick shows the frame the rows started with
+    guitest::Pump(); // nothing on the display tells that the toolkit has painted it
+    const wxImage before = Screen();
+    Tick();
+    wxImage after;
+    ASSERT_TRUE(guitest::PumpUntil(
+        [&]
+        {
+            return (after = Screen()).IsOk() &&
+                   !SameImage(before.GetSubImage(wheel(3)), after.GetSubImage(wheel(3)));
+        }));
     for (long row = 0; row < 4; ++row)
     {
-        const wxRect wheel(status.x, row * lineHeight, 18, lineHeight);
         const wxRect rest(0, row * lineHeight, status.x, lineHeight);
-        EXPECT_EQ(SameImage(before.GetSubImage(wheel), after.GetSubImage(wheel)), row == 1 || row == 2)
+        EXPECT_EQ(SameImage(before.GetSubImage(wheel(row)), after.GetSubImage(wheel(row))),
+                  row == 1 || row == 2)
             << "only rows 0 and 3 are in progress; row " << row;
         EXPECT_TRUE(SameImage(before.GetSubImage(rest), after.GetSubImage(rest))) << "row " << row;
     }
@@ -220,10 +219,8 @@ TEST_F(StatusView, ATickTurnsTheWheelOfRowsInProgressOnly)
 
 TEST_F(StatusView, RowsArePaintedInTheFrameRightAfterAnUpdateBeforeIdleTime)
 {
-    statustest::SystemRoot::WriteFile(root.JournalPath(), Line("a", "srv1") + Line("b", "srv1"));
-    ASSERT_EQ(model.Refresh(), 1);
     // The update's event, then a paint: the order GTK keeps, idle time comes after.
-    wxTheApp->ProcessPendingEvents();
+    Produce(Line("a", "srv1") + Line("b", "srv1"));
     ASSERT_EQ(List()->GetItemCount(), 2);
     const wxImage screen = DrawNow(List()->GetMainWindow());
     ASSERT_TRUE(screen.IsOk());
@@ -241,7 +238,7 @@ TEST_F(StatusView, TheLongestStatusAndASevenDigitSizeFitTheirColumns)
 {
     Produce(Line("a", "srv1", "Transferring to server", "1383035055", "1048576") +
             Line("b", "srv1", "Converting file type", "1383035055", "1048575"));
-    EXPECT_EQ(Column(5), (std::vector<wxString>{"1024.00KB", "1024.00KB"}));
+    EXPECT_EQ(Column(5), (Texts{"1024.00KB", "1024.00KB"}));
     for (int column : {5, 7})
     {
         wxRect cell;
@@ -256,5 +253,4 @@ TEST_F(StatusView, TheLongestStatusAndASevenDigitSizeFitTheirColumns)
         EXPECT_TRUE(SameImage(fitted, roomy)) << "column " << column << " shortens its text";
     }
 }
-
 } // namespace
