@@ -1,21 +1,11 @@
 #pragma once
 
 #include <initializer_list>
-#include <memory>
-
-#include <gtest/gtest.h>
 
 #include <wx/app.h>
 #include <wx/dir.h>
-#include <wx/ffile.h>
-#include <wx/filefn.h>
-#include <wx/filename.h>
-#include <wx/init.h>
-#include <wx/string.h>
-#include <wx/utils.h>
 
 #include "SystemRoot.h"
-#include "data/DataLocations.h"
 
 namespace logtest
 {

@@ -1,20 +1,9 @@
 #pragma once
 
-#include <gtest/gtest.h>
-
-#include <memory>
-
 #include <wx/app.h>
 #include <wx/event.h>
-#include <wx/ffile.h>
-#include <wx/filefn.h>
-#include <wx/filename.h>
-#include <wx/init.h>
-#include <wx/string.h>
-#include <wx/utils.h>
 
 #include "SystemRoot.h"
-#include "data/DataLocations.h"
 #include "pump/bus/CustomEvents.h"
 #include "pump/bus/EventBus.h"
 
