@@ -184,28 +184,22 @@ TEST_F(NotebookTest, AClickSelectsATabWithChangingThenChangedUnlessVetoed)
 
 TEST_F(NotebookTest, ControlKeysInAPageCycleThroughThePages)
 {
-    const struct
+    // key, modifiers, the pages selected by each press from page 0.
+    for (const auto& [key, modifiers, selections] : {std::tuple{WXK_TAB, int(wxMOD_CONTROL), "1201"},
+                                                     {WXK_TAB, wxMOD_CONTROL | wxMOD_SHIFT, "2102"},
+                                                     {WXK_PAGEDOWN, wxMOD_CONTROL, "120"},
+                                                     {WXK_PAGEUP, wxMOD_CONTROL, "210"}})
     {
-        int key, modifiers;
-        std::vector<int> selections; // after each press, from page 0
-    } cycles[] = {{WXK_TAB, wxMOD_CONTROL, {1, 2, 0, 1}},
-                  {WXK_TAB, wxMOD_CONTROL | wxMOD_SHIFT, {2, 1, 0, 2}},
-                  {WXK_PAGEDOWN, wxMOD_CONTROL, {1, 2, 0}},
-                  {WXK_PAGEUP, wxMOD_CONTROL, {2, 1, 0}}};
-    for (const auto& cycle : cycles)
-    {
-        SCOPED_TRACE(testing::Message() << "key " << cycle.key << " modifiers " << cycle.modifiers);
         book->ChangeSelection(0);
-        int previous = 0;
-        for (int expected : cycle.selections)
+        for (int previous = 0, i = 0; selections[i]; previous = selections[i++] - '0')
         {
+            const int expected = selections[i] - '0';
             events.clear();
-            PressInPage(cycle.key, cycle.modifiers);
-            ASSERT_EQ(book->GetSelection(), expected);
+            PressInPage(key, modifiers);
+            ASSERT_EQ(book->GetSelection(), expected) << key << " " << modifiers << " press " << i;
             EXPECT_TRUE(book->GetPage(expected)->IsShown() && !book->GetPage(previous)->IsShown());
             EXPECT_EQ(events, (std::vector<wxString>{wxString::Format("changing %d>%d", previous, expected),
                                                      wxString::Format("changed %d>%d", previous, expected)}));
-            previous = expected;
         }
     }
 

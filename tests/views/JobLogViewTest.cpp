@@ -34,14 +34,12 @@ class DialogScript : public wxModalDialogHook
 public:
     explicit DialogScript(std::deque<int> answers) : answers(std::move(answers)) { Register(); }
     ~DialogScript() override { Unregister(); }
-
     Texts messages;
 
 protected:
     int Enter(wxDialog* dialog) override
     {
-        const auto* box = dynamic_cast<wxMessageDialog*>(dialog);
-        messages.push_back(box ? box->GetMessage() : dialog->GetTitle());
+        messages.push_back(static_cast<wxMessageDialog*>(dialog)->GetMessage());
         if (answers.empty())
         {
             ADD_FAILURE() << "unexpected dialog: " << messages.back();
