@@ -161,8 +161,14 @@ TEST_F(NotebookTest, ShowsThePagesInOrderAndTheFirstWithoutEvents)
     EXPECT_TRUE(events.empty());
 }
 
-TEST_F(NotebookTest, AClickSelectsATabWithChangingThenChangedUnlessVetoed)
+TEST_F(NotebookTest, AClickOnATabSelectsItWithChangingThenChangedUnlessVetoed)
 {
+    // Where a click lands: on a tab, or on the page below the strip.
+    long flags = 0;
+    EXPECT_EQ(book->HitTest(tabs[1].GetPosition() + wxPoint(1, 1), &flags), 1);
+    EXPECT_EQ(flags, wxBK_HITTEST_ONITEM);
+    EXPECT_EQ(book->HitTest(wxPoint(10, book->GetTabStripHeight() + 10), &flags), wxNOT_FOUND);
+    EXPECT_EQ(flags, wxBK_HITTEST_ONPAGE);
     ClickTab(0);                                                                           // the selected one
     MouseOnStrip(wxEVT_LEFT_DOWN, wxPoint(book->GetTabStrip()->GetClientSize().x - 2, 2)); // beside the tabs
     EXPECT_TRUE(events.empty());
@@ -292,15 +298,6 @@ TEST_F(NotebookTest, PagesFillTheAreaBelowTheStripAndHooksChangeTheLayout)
     ASSERT_EQ(book->decorated.size(), 3u);
     for (size_t i = 0; i < 3; ++i)
         EXPECT_EQ(book->decorated[i], std::make_pair(i, grown[i]));
-}
-
-TEST_F(NotebookTest, HitTestFindsTabsAndThePage)
-{
-    long flags = 0;
-    EXPECT_EQ(book->HitTest(tabs[1].GetPosition() + wxPoint(1, 1), &flags), 1);
-    EXPECT_EQ(flags, wxBK_HITTEST_ONITEM);
-    EXPECT_EQ(book->HitTest(wxPoint(10, book->GetTabStripHeight() + 10), &flags), wxNOT_FOUND);
-    EXPECT_EQ(flags, wxBK_HITTEST_ONPAGE);
 }
 
 TEST_F(NotebookTest, AddingAndRemovingPagesKeepsTheSelectionOnTheSamePageOrItsNeighbour)
