@@ -156,45 +156,9 @@ TEST_F(LogModel, FailedJobsNameTheirFoldersOnceInFirstSeenOrderDuplicatesInclude
     EXPECT_EQ((Keys{"/hf/B", "/hf/A", "/hf/b", "/hf/Bad"}), folders());
 }
 
-// --- handing records to the view ---------------------------------------------
-
+// A log view's stand-in takes what came in since its cursor on each update.
 TEST_F(LogModel, CursorCollectsEveryRecordAcrossPollsTheViewMissed)
 {
-    std::uint64_t cursor = 0;
-    std::vector<JobRecord> seen;
-    Write(LogLine("1", "ADDED"));
-    ASSERT_EQ(1, m_model.Parse());
-    EXPECT_EQ(1u, m_model.GetRecordsSince(cursor, seen));
-
-    // Three polls bring records before the view gets to handle any update.
-    Append(LogLine("2", "ADDED") + LogLine("3", "ADDED"));
-    ASSERT_EQ(1, m_model.Parse());
-    Append(LogLine("4", "ADDED"));
-    ASSERT_EQ(1, m_model.Parse());
-    EXPECT_EQ(0, m_model.Parse());
-
-    EXPECT_TRUE(New(m_model).empty());
-    EXPECT_EQ(3u, m_model.GetRecordsSince(cursor, seen));
-    EXPECT_EQ(0u, m_model.GetRecordsSince(cursor, seen));
-    EXPECT_EQ((Keys{"1", "2", "3", "4"}), KeysOf(seen));
-
-    // After a clear, a view's cursor and a new one both start at what came in since.
-    std::uint64_t fresh = 0;
-    ASSERT_EQ(0, m_model.ClearLog());
-    Append(LogLine("1", "ADDED") + LogLine("5", "ADDED"));
-    ASSERT_EQ(1, m_model.Parse());
-    std::vector<JobRecord> fromCurrent;
-    std::vector<JobRecord> fromFresh;
-    EXPECT_EQ(2u, m_model.GetRecordsSince(cursor, fromCurrent));
-    EXPECT_EQ(2u, m_model.GetRecordsSince(fresh, fromFresh));
-    EXPECT_EQ((Keys{"1", "5"}), KeysOf(fromCurrent));
-    EXPECT_EQ((Keys{"1", "5"}), KeysOf(fromFresh));
-    EXPECT_EQ(cursor, fresh);
-}
-
-TEST_F(LogModel, RefreshTellsTheLogChannelOnlyWhenRecordsCameIn)
-{
-    // A log view's stand-in: takes what came in since its cursor on each update.
     int updates = 0;
     std::uint64_t cursor = 0;
     std::vector<JobRecord> shown;
@@ -209,23 +173,38 @@ TEST_F(LogModel, RefreshTellsTheLogChannelOnlyWhenRecordsCameIn)
               });
     ASSERT_TRUE(EventBus::Get().Subscribe(ChannelKey(1), &view));
 
+    // Refresh tells the log channel only when records came in.
     Write(LogLine("1", "ADDED"));
     EXPECT_EQ(1, m_model.Refresh());
     EXPECT_EQ(0, m_model.Refresh());
     Append(LogLine("1", "ADDED") + LogLine("2", "MODIFIED"));
     EXPECT_EQ(0, m_model.Refresh());
-    Append(LogLine("2", "ADDED"));
+    Append(LogLine("2", "ADDED") + LogLine("3", "ADDED"));
     EXPECT_EQ(1, m_model.Refresh());
-    Append(LogLine("3", "ADDED"));
+    Append(LogLine("4", "ADDED"));
     EXPECT_EQ(1, m_model.Refresh());
 
     // The view's turn comes only now, after several polls.
     wxAppConsole::GetInstance()->ProcessPendingEvents();
     EventBus::Get().Unsubscribe(&view);
     EXPECT_EQ(3, updates);
-    EXPECT_EQ((Keys{"1", "2", "3"}), KeysOf(shown));
+    EXPECT_EQ((Keys{"1", "2", "3", "4"}), KeysOf(shown));
+    EXPECT_EQ(0u, m_model.GetRecordsSince(cursor, shown));
     // What the view would have lost through the latest read's list alone.
-    EXPECT_EQ((Keys{"3", "3", "3"}), KeysOf(shownFromNewRecords));
+    EXPECT_EQ((Keys{"4", "4", "4"}), KeysOf(shownFromNewRecords));
+
+    // After a clear, a view's cursor and a new one both start at what came in since.
+    std::uint64_t fresh = 0;
+    ASSERT_EQ(0, m_model.ClearLog());
+    Append(LogLine("1", "ADDED") + LogLine("5", "ADDED"));
+    ASSERT_EQ(1, m_model.Parse());
+    std::vector<JobRecord> fromCurrent;
+    std::vector<JobRecord> fromFresh;
+    EXPECT_EQ(2u, m_model.GetRecordsSince(cursor, fromCurrent));
+    EXPECT_EQ(2u, m_model.GetRecordsSince(fresh, fromFresh));
+    EXPECT_EQ((Keys{"1", "5"}), KeysOf(fromCurrent));
+    EXPECT_EQ((Keys{"1", "5"}), KeysOf(fromFresh));
+    EXPECT_EQ(cursor, fresh);
 }
 
 // --- clearing the log -------------------------------------------------------
