@@ -102,18 +102,15 @@ TEST(FolderErrors, ClearLogClearsEveryMarkerAndRefreshesAsTheSettingSays)
     }
 }
 
-TEST(FolderErrors, HotFolderNamesAreTheLastPathComponents)
+TEST(FolderErrors, AcknowledgingClearsAMarkedFolderAndRefreshesItAlone)
 {
     Scene scene;
     wxArrayString names = logtest::Strings({"stale"});
     EXPECT_EQ(1, scene.model.GetHotFolderNames(names));
     EXPECT_EQ((std::vector<wxString>{"In", "PDF Proofs", "Tiffs"}),
-              std::vector<wxString>(names.begin(), names.end()));
-}
+              std::vector<wxString>(names.begin(), names.end()))
+        << "the hot folders' names are their last path components";
 
-TEST(FolderErrors, AcknowledgingClearsAMarkedFolderAndRefreshesItAlone)
-{
-    Scene scene;
     for (const char* setting : {"0", "1"})
     {
         scene.UseSetting(setting);
