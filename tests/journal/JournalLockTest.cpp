@@ -1,89 +1,82 @@
-// The named locks between processes and threads, and how the operations wait.
-#include <atomic>
-#include <filesystem>
-#include <future>
-#include <thread>
+// The named locks, how the operations wait for them, and what a writer may do
+// to a journal in a folder other users share.
+#include <unistd.h>
 
-#include <gtest/gtest.h>
-#include <sys/stat.h>
+#include <algorithm>
+#include <atomic>
+#include <future>
 
 #include "JournalTestSupport.h"
 #include "data/NamedMutex.h"
+#include "tools/simulator/HotFolderSimulator.h"
+#include "tools/simulator/SimulatorOptions.h"
 
 namespace journaltest
 {
 namespace
 {
 
-using Lines = std::vector<std::string>;
-
-class JournalLock : public JournalTest
-{
+const char* const kStatus = "TiveraJobsStatusFile";
+const char* const kLog = "TiveraJobsLogFile";
+const std::string kOne = "1\ta\tADDED\r\n";
+const std::vector<Arguments> kWritingOperations = {
+    {"add", "2\tb"}, {"modify", "1\tz"}, {"delete", "1"}, {"remove", "1"}, {"commit", "1"}, {"clear"},
 };
 
-TEST_F(JournalLock, TryLockFailsWhileAnotherProcessHoldsTheLock)
+Arguments On(const std::string& journal, const Arguments& operation)
 {
-    ExternalLockHolder holder(LockFile("TiveraJobsStatusFile"));
-    ASSERT_TRUE(holder.Holding());
+    Arguments arguments{journal};
+    arguments.insert(arguments.end(), operation.begin(), operation.end());
+    return arguments;
+}
+
+using JournalLock = JournalTest;
+
+TEST_F(JournalLock, TwoLocksOfOneNameExcludeEachOtherUntilOneIsReleasedOrGone)
+{
+    named_mutex_lock first(kStatus), other(kLog);
+    ASSERT_TRUE(first.lock());
+    EXPECT_TRUE(other.try_lock()); // another name is another lock
     {
-        named_mutex_lock lock("TiveraJobsStatusFile");
-        EXPECT_FALSE(lock.try_lock());
-        // Another name is another lock.
-        named_mutex_lock other("TiveraJobsLogFile");
-        EXPECT_TRUE(other.try_lock());
+        named_mutex_lock second(kStatus);
+        EXPECT_FALSE(second.try_lock());
+        first.unlock();
+        EXPECT_TRUE(second.try_lock());
     }
-    holder.Release();
-    named_mutex_lock lock("TiveraJobsStatusFile");
-    EXPECT_TRUE(lock.try_lock());
+    EXPECT_TRUE(first.try_lock());
 }
 
-TEST_F(JournalLock, AWritingOperationWaitsUntilTheLockIsReleased)
+TEST_F(JournalLock, WritersAndTheCommandWaitUntilTheLockIsReleased)
 {
-    WriteBytes(StatusJournal(), "1\ta\tADDED\r\n");
-    ExternalLockHolder holder(LockFile("TiveraJobsStatusFile"));
-    ASSERT_TRUE(holder.Holding());
-
-    std::atomic<bool> returned{false};
-    auto add = std::async(std::launch::async,
-                          [this, &returned]
-                          {
-                              wyx::JobsFileReadWriter journal = Journal(StatusJournal());
-                              wxString line = "2\tb";
-                              const int result = journal.AddJob(line);
-                              returned = true;
-                              return result;
-                          });
-    ASSERT_TRUE(
-        WaitUntilBlockedOn(LockFile("TiveraJobsStatusFile"), [&returned] { return returned.load(); }));
-    EXPECT_FALSE(returned.load());
-    EXPECT_EQ(ReadBytes(StatusJournal()), "1\ta\tADDED\r\n");
-
-    holder.Release();
-    EXPECT_EQ(add.get(), wyx::JobOk);
-    EXPECT_EQ(ReadBytes(StatusJournal()), "1\ta\tADDED\r\n2\tb\tADDED\r\n");
+    for (bool command : {false, true})
+    {
+        SCOPED_TRACE(command ? "wyx-journal" : "AddJob");
+        WriteBytes(StatusJournal(), kOne);
+        std::future<int> add; // joined after the holder has gone
+        named_mutex_lock holder(kStatus);
+        ASSERT_TRUE(holder.lock());
+        add = std::async(std::launch::async,
+                         [this, command]
+                         {
+                             wxString line = "2\tb";
+                             return command ? RunTool({"status", "add", "2\tb"}).status
+                                            : Journal(StatusJournal()).AddJob(line);
+                         });
+        ASSERT_TRUE(WaitUntilBlockedOn(
+            LockFile(kStatus),
+            [&add] { return add.wait_for(std::chrono::seconds(0)) == std::future_status::ready; }));
+        EXPECT_EQ(ReadBytes(StatusJournal()), kOne);
+        holder.unlock();
+        EXPECT_EQ(add.get(), wyx::JobOk);
+        EXPECT_EQ(ReadBytes(StatusJournal()), kOne + "2\tb\tADDED\r\n");
+    }
 }
 
-TEST_F(JournalLock, TheProducerCommandWaitsForTheLockToo)
+TEST_F(JournalLock, AReaderThatMustNotWaitGivesUpWithLockFailedAndKeepsItsLines)
 {
-    WriteBytes(LogJournal(), "");
-    ExternalLockHolder holder(LockFile("TiveraJobsLogFile"));
-    ASSERT_TRUE(holder.Holding());
-    auto add = std::async(std::launch::async, [] { return RunTool({"log", "add", "9\tz"}).status; });
-    ASSERT_TRUE(
-        WaitUntilBlockedOn(LockFile("TiveraJobsLogFile"), [&add]
-                           { return add.wait_for(std::chrono::seconds(0)) == std::future_status::ready; }));
-    EXPECT_EQ(ReadBytes(LogJournal()), "");
-    holder.Release();
-    EXPECT_EQ(add.get(), 0);
-    EXPECT_EQ(ReadBytes(LogJournal()), "9\tz\tADDED\r\n");
-}
-
-TEST_F(JournalLock, AReaderThatMustNotWaitGivesUpWithLockFailed)
-{
-    WriteBytes(LogJournal(), "1\ta\tADDED\r\n");
-    ExternalLockHolder holder(LockFile("TiveraJobsLogFile"));
-    ASSERT_TRUE(holder.Holding());
-
+    WriteBytes(LogJournal(), kOne);
+    named_mutex_lock holder(kLog);
+    ASSERT_TRUE(holder.lock());
     const std::atomic<bool> running{false};
     wyx::JobsFileReadWriter journal = Journal(LogJournal());
     journal.SetKeepWaiting(&running);
@@ -94,93 +87,293 @@ TEST_F(JournalLock, AReaderThatMustNotWaitGivesUpWithLockFailed)
     wxString line = "2\tb";
     EXPECT_EQ(journal.AddJob(line), wyx::JobLockFailed);
     EXPECT_EQ(Utf8(line), "2\tb");
-    EXPECT_EQ(ReadBytes(LogJournal()), "1\ta\tADDED\r\n");
-
-    named_mutex_lock lock("TiveraJobsLogFile");
+    EXPECT_EQ(ReadBytes(LogJournal()), kOne);
+    named_mutex_lock lock(kLog);
     EXPECT_FALSE(lock.lock(&running));
 }
 
-TEST_F(JournalLock, AWaitEndsWhenTheFlagTurnsFalse)
+TEST_F(JournalLock, AWaitEndsWhenTheFlagTurnsFalseAndSucceedsOnceReleased)
 {
-    ExternalLockHolder holder(LockFile("TiveraJobsLogFile"));
-    ASSERT_TRUE(holder.Holding());
-    std::atomic<bool> running{true};
-    auto wait = std::async(std::launch::async,
-                           [&running]
-                           {
-                               named_mutex_lock lock("TiveraJobsLogFile");
-                               return lock.lock(&running);
-                           });
-    running = false;
-    EXPECT_FALSE(wait.get());
-}
-
-TEST_F(JournalLock, AWaitWithTheFlagSetSucceedsOnceReleased)
-{
-    ExternalLockHolder holder(LockFile("TiveraJobsLogFile"));
-    ASSERT_TRUE(holder.Holding());
-    const std::atomic<bool> running{true};
-    auto wait = std::async(std::launch::async,
-                           [&running]
-                           {
-                               named_mutex_lock lock("TiveraJobsLogFile");
-                               return lock.lock(&running);
-                           });
-    holder.Release();
-    EXPECT_TRUE(wait.get());
-}
-
-TEST_F(JournalLock, TwoLocksOfOneProcessExcludeEachOther)
-{
-    named_mutex_lock first("TiveraJobsStatusFile");
-    ASSERT_TRUE(first.lock());
+    for (bool release : {false, true})
     {
-        named_mutex_lock second("TiveraJobsStatusFile");
-        EXPECT_FALSE(second.try_lock());
-        first.unlock();
-        EXPECT_TRUE(second.try_lock());
-        // Destroying the lock releases it.
+        std::atomic<bool> running{true};
+        std::future<bool> wait;
+        named_mutex_lock holder(kLog);
+        ASSERT_TRUE(holder.lock());
+        wait = std::async(std::launch::async,
+                          [&running]
+                          {
+                              named_mutex_lock lock(kLog);
+                              return lock.lock(&running);
+                          });
+        if (release)
+            holder.unlock();
+        else
+            running = false;
+        EXPECT_EQ(wait.get(), release);
     }
-    EXPECT_TRUE(first.try_lock());
 }
 
 TEST_F(JournalLock, TheLockFileAndItsFolderAreMadeForEveryUser)
 {
     const mode_t previous = ::umask(077);
-    {
-        named_mutex_lock lock("TiveraJobsStatusFile");
-        EXPECT_TRUE(lock.try_lock());
-    }
+    EXPECT_TRUE(named_mutex_lock(kStatus).try_lock());
     ::umask(previous);
-    struct stat info;
-    ASSERT_EQ(::stat(LockFile("TiveraJobsStatusFile").c_str(), &info), 0);
-    EXPECT_EQ(info.st_mode & 07777, 0666u);
-    ASSERT_EQ(::stat((Root() + "/dev/shm").c_str(), &info), 0);
-    EXPECT_EQ(info.st_mode & 07777, 01777u);
+    EXPECT_EQ(fs::status(LockFile(kStatus)).permissions(), static_cast<fs::perms>(0666));
+    EXPECT_EQ(fs::status(Root() + "/dev/shm").permissions(), static_cast<fs::perms>(01777));
 }
 
-TEST_F(JournalLock, ALinkInPlaceOfTheLockFileIsNotFollowed)
+TEST_F(JournalLock, ALinkAtTheLockFileIsNotFollowed)
 {
-    std::filesystem::create_directories(Root() + "/dev/shm");
+    fs::create_directories(Root() + "/dev/shm");
     WriteBytes(Root() + "/victim", "untouched");
-    std::filesystem::create_symlink(Root() + "/victim", LockFile("TiveraJobsStatusFile"));
-    WriteBytes(StatusJournal(), "1\ta\tADDED\r\n");
-
-    named_mutex_lock lock("TiveraJobsStatusFile");
+    fs::create_symlink(Root() + "/victim", LockFile(kStatus));
+    WriteBytes(StatusJournal(), kOne);
+    named_mutex_lock lock(kStatus);
     EXPECT_FALSE(lock.lock());
     EXPECT_FALSE(lock.try_lock());
     EXPECT_EQ(Journal(StatusJournal()).DeleteJob("1"), wyx::JobLockFailed);
-    EXPECT_EQ(ReadBytes(StatusJournal()), "1\ta\tADDED\r\n");
+    EXPECT_EQ(ReadBytes(StatusJournal()), kOne);
 }
 
 TEST_F(JournalLock, AMutexThatCannotBeMadeLocksNothing)
 {
-    // The lock folder cannot be created where a file stands.
-    WriteBytes(Root() + "/dev", "a file");
-    named_mutex_lock lock("TiveraJobsStatusFile");
+    WriteBytes(Root() + "/dev", "a file where the lock folder belongs");
+    named_mutex_lock lock(kStatus);
     EXPECT_FALSE(lock.lock());
     EXPECT_FALSE(lock.try_lock());
     lock.unlock();
+}
+
+// --- a rewrite replaces the journal whole or not at all ---------------------------------
+
+using AtomicWrite = JournalTest;
+using JournalPlant = JournalTest;
+using JournalPermission = JournalTest;
+
+TEST_F(AtomicWrite, ARewriteIsANewFileWithTheOldModeAndOwnerAndLinksStayLinks)
+{
+    if (::geteuid() != 0)
+        GTEST_SKIP() << "needs root to give the journal another owner";
+    WriteBytes(StatusJournal(), kOne);
+    ASSERT_EQ(::chmod(StatusJournal().c_str(), 0640), 0);
+    ASSERT_EQ(::chown(StatusJournal().c_str(), 4321, 4322), 0);
+    struct stat before = {}, after = {};
+    ASSERT_EQ(::stat(StatusJournal().c_str(), &before), 0);
+    ASSERT_EQ(RunTool({"status", "add", "2\tb"}).status, 0);
+    ASSERT_EQ(::stat(StatusJournal().c_str(), &after), 0);
+    EXPECT_NE(after.st_ino, before.st_ino);
+    EXPECT_EQ(after.st_mode & 07777, 0640u);
+    EXPECT_EQ(after.st_uid, 4321u);
+    EXPECT_EQ(after.st_gid, 4322u);
+    EXPECT_EQ(ReadBytes(StatusJournal()), kOne + "2\tb\tADDED\r\n");
+    EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsStatusFile.txt"});
+
+    WriteBytes(Root() + "/real.txt", kOne);
+    fs::create_symlink(Root() + "/real.txt", LogJournal());
+    ASSERT_EQ(RunTool({"log", "commit", "1"}).status, 0);
+    EXPECT_TRUE(fs::is_symlink(LogJournal()));
+    EXPECT_EQ(ReadBytes(Root() + "/real.txt"), "1\ta\tCOMMIT\r\n");
+}
+
+TEST_F(AtomicWrite, AFileTooLargeForTheProcessLeavesTheJournalIntact)
+{
+    // The file size limit makes the new file's write fail as a full disk
+    // would, even for root; its signal must not end the tool beside its temporary file.
+    const std::string original(2000, 'x');
+    WriteBytes(LogJournal(), original);
+    EXPECT_EQ(RunTool({"log", "add", "new\tn.pdf"}, "ulimit -f 1;").status, wyx::JobWriteFailed);
+    EXPECT_EQ(ReadBytes(LogJournal()), original);
+    EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsLogFile.txt"});
+}
+
+TEST_F(AtomicWrite, ATemporaryFileThatCannotBeMadeLeavesTheJournalIntact)
+{
+    // At the file system's name limit there is no room for the temporary's name.
+    const std::string name = std::string(250, 'j') + ".txt";
+    WriteBytes(DataDirectory() + name, kOne);
+    wyx::JobsFileReadWriter journal = Journal(DataDirectory() + name);
+    wxString line = "2\tb";
+    EXPECT_EQ(journal.AddJob(line), wyx::JobWriteFailed);
+    EXPECT_EQ(journal.DeleteJob("1"), wyx::JobWriteFailed);
+    EXPECT_EQ(journal.ClearJobs(), wyx::JobWriteFailed);
+    EXPECT_EQ(ReadBytes(DataDirectory() + name), kOne);
+    EXPECT_EQ(FolderEntries(DataDirectory()), Lines{name});
+    EXPECT_EQ(ReadLines(DataDirectory() + name), Lines{"1\ta\tADDED"});
+}
+
+// --- links another user planted -----------------------------------------------------------
+
+struct LinkCase
+{
+    const char* name;
+    std::vector<bool> ownedByOther; // the chain of links from the journal's path on
+};
+
+class JournalLink : public JournalTest, public ::testing::WithParamInterface<LinkCase>
+{
+};
+
+TEST_P(JournalLink, IsWrittenThroughOnlyWhenEveryLinkIsTheWritersOwn)
+{
+    if (::geteuid() != 0)
+        GTEST_SKIP() << "only root can give a link to another user";
+    const std::vector<bool>& owners = GetParam().ownedByOther;
+    const bool followed = std::find(owners.begin(), owners.end(), true) == owners.end();
+    const std::string target = Root() + "/own-file.txt";
+    auto link = [&](std::size_t i)
+    { return i == 0 ? StatusJournal() : Root() + "/link" + std::to_string(i); };
+    for (const Arguments& operation : kWritingOperations)
+    {
+        SCOPED_TRACE(operation[0]);
+        WriteBytes(target, kOne);
+        for (std::size_t i = 0; i < owners.size(); ++i)
+        {
+            fs::create_symlink(i + 1 == owners.size() ? target : link(i + 1), link(i));
+            ASSERT_EQ(::lchown(link(i).c_str(), owners[i] ? 4321 : 0, owners[i] ? 4321 : 0), 0);
+        }
+        EXPECT_EQ(RunTool(On("status", operation)).status, followed ? wyx::JobOk : wyx::JobWriteFailed);
+        EXPECT_EQ(ReadBytes(target) == kOne, !followed);
+        EXPECT_TRUE(fs::is_symlink(StatusJournal()));
+        for (const std::string& entry : FolderEntries(Root()))
+            EXPECT_NE(entry.rfind(".own-file", 0), 0u) << "a temporary was left: " << entry;
+        for (std::size_t i = 0; i < owners.size(); ++i)
+            fs::remove(link(i));
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Chains, JournalLink,
+                         ::testing::Values(LinkCase{"Own", {false}}, LinkCase{"Others", {true}},
+                                           LinkCase{"OwnThenOthers", {false, true}},
+                                           LinkCase{"OthersThenOwn", {true, false}},
+                                           LinkCase{"OwnThenOwn", {false, false}}),
+                         [](const auto& info) { return std::string(info.param.name); });
+
+// --- things that are no file, at the journal's path ---------------------------------------
+
+TEST_F(JournalPlant, WhatIsNoFileIsNeitherReadNorWrittenAndNothingWaits)
+{
+    const std::vector<std::pair<const char*, std::function<void(const std::string&)>>> plants = {
+        {"fifo", [](const std::string& p) { ASSERT_EQ(::mkfifo(p.c_str(), 0666), 0); }},
+        {"folder", [](const std::string& p) { fs::create_directory(p); }},
+        {"link to a device", [](const std::string& p) { fs::create_symlink("/dev/zero", p); }},
+        {"dangling link", [](const std::string& p) { fs::create_symlink(p + ".gone", p); }}};
+    std::vector<Arguments> operations = kWritingOperations;
+    operations.push_back({"read"});
+    for (const auto& [name, plant] : plants)
+    {
+        plant(StatusJournal());
+        for (const Arguments& operation : operations)
+        {
+            const ToolRun run = RunTool(On("status", operation));
+            EXPECT_EQ(run.status, wyx::JobFileMissing) << name << ": " << operation[0];
+            EXPECT_EQ(run.out, "") << name << ": " << operation[0];
+        }
+        EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsStatusFile.txt"}) << name;
+        fs::remove(StatusJournal());
+    }
+}
+
+// --- a journal the writer may not write --------------------------------------------------
+
+TEST_F(JournalPermission, AReadOnlyJournalIsReplacedByRootAloneNeverBehindItsOwnersBack)
+{
+    if (::geteuid() != 0)
+        GTEST_SKIP() << "needs root to run the command as another user";
+    // Folders writable by everyone, as 1777 folders are.
+    fs::permissions(Root(), fs::perms::owner_all | fs::perms::group_read | fs::perms::group_exec |
+                                fs::perms::others_read | fs::perms::others_exec);
+    fs::permissions(DataDirectory(), fs::perms::all | fs::perms::sticky_bit);
+    fs::create_directories(Root() + "/dev/shm");
+    fs::permissions(Root() + "/dev/shm", fs::perms::all | fs::perms::sticky_bit);
+    for (const Arguments& operation : kWritingOperations)
+    {
+        WriteBytes(StatusJournal(), kOne);
+        ASSERT_EQ(::chmod(StatusJournal().c_str(), 0444), 0);
+        ASSERT_EQ(::chown(StatusJournal().c_str(), 65534, 65534), 0);
+        EXPECT_EQ(RunToolAs(65534, On(StatusJournal(), operation)).status, wyx::JobWriteFailed)
+            << operation[0];
+        EXPECT_EQ(ReadBytes(StatusJournal()), kOne) << operation[0];
+        EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsStatusFile.txt"});
+        ::unlink(StatusJournal().c_str());
+    }
+    WriteBytes(StatusJournal(), kOne);
+    ASSERT_EQ(::chmod(StatusJournal().c_str(), 0444), 0);
+    ASSERT_EQ(RunTool({"status", "commit", "1"}).status, 0);
+    EXPECT_EQ(ReadBytes(StatusJournal()), "1\ta\tCOMMIT\r\n");
+}
+
+// --- the service simulator: never through what another user planted -----------------------
+
+class SimulatorFiles : public JournalTest
+{
+protected:
+    std::string HotFolderRoot() const { return Root() + "/srv/hotfolders"; }
+    std::string Victim() const { return Root() + "/victim.txt"; }
+    HotFolderSimulator Simulator() const
+    {
+        SimulatorOptions options;
+        options.jobsPerSecond = 200;
+        options.durationSeconds = 0.1;
+        options.stepSeconds = 0.002;
+        options.failureShare = 1;
+        options.seed = 7;
+        options.seedGiven = true;
+        options.dataDirectory = DataDirectory();
+        options.hotFolderRoot = HotFolderRoot();
+        return HotFolderSimulator(options, [] { return false; });
+    }
+    void SetUp() override
+    {
+        JournalTest::SetUp();
+        WriteBytes(Victim(), "not the simulator's\n");
+    }
+    void TearDown() override { EXPECT_EQ(ReadBytes(Victim()), "not the simulator's\n"); }
+};
+
+TEST_F(SimulatorFiles, LinksAtHotFoldersIniAreNotWrittenThroughUnlessTheyAreOwn)
+{
+    if (::geteuid() != 0)
+        GTEST_SKIP() << "only root can give a link to another user";
+    fs::create_symlink(Victim(), DataDirectory() + "HotFolders.ini.new"); // the old temporary name
+    wxString problem;
+    ASSERT_TRUE(Simulator().Prepare(problem)) << problem;
+    EXPECT_TRUE(fs::is_regular_file(fs::symlink_status(DataDirectory() + "HotFolders.ini")));
+    EXPECT_NE(ReadBytes(DataDirectory() + "HotFolders.ini").find("[Servers]"), std::string::npos);
+
+    fs::remove(DataDirectory() + "HotFolders.ini");
+    fs::create_symlink(Victim(), DataDirectory() + "HotFolders.ini");
+    ASSERT_EQ(::lchown((DataDirectory() + "HotFolders.ini").c_str(), 4321, 4321), 0);
+    EXPECT_FALSE(Simulator().Prepare(problem));
+}
+
+TEST_F(SimulatorFiles, ErrorMarkersAreNeverWrittenThroughALink)
+{
+    HotFolderSimulator simulator = Simulator();
+    wxString problem;
+    ASSERT_TRUE(simulator.Prepare(problem)) << problem;
+    std::size_t folders = 0;
+    for (const auto& entry : fs::recursive_directory_iterator(HotFolderRoot()))
+        if (entry.is_directory() && entry.path().filename() == "[_KELVO_HotFolder_]" && ++folders)
+            fs::create_symlink(Victim(), entry.path() / "Error.er");
+    ASSERT_GT(folders, 0u);
+    const HotFolderSimulator::Totals totals = simulator.Run();
+    ASSERT_GT(totals.failed, 0u);
+    EXPECT_EQ(totals.markerErrors, totals.failed);
+    EXPECT_EQ(totals.journalErrors, 0u);
+    EXPECT_FALSE(totals.AllWritten());
+}
+
+TEST_F(SimulatorFiles, TheProgramsStatusTellsWhetherEveryWriteWasMade)
+{
+    const Arguments arguments{"--rate",         "200/s",         "--duration",       "0.1",
+                              "--step-seconds", "0.002",         "--seed",           "7",
+                              "--data-dir",     DataDirectory(), "--hotfolder-root", HotFolderRoot()};
+    const std::string simulator = "exec 2>/dev/null " + Quoted(WYX_SIMULATOR_TOOL);
+    EXPECT_EQ(Run(simulator, arguments).status, 0);
+    fs::remove(StatusJournal());
+    fs::create_directories(StatusJournal());
+    EXPECT_EQ(Run(simulator, arguments).status, 3);
 }
 
 } // namespace

@@ -1,88 +1,150 @@
 #pragma once
 
-#include <cstdio>
+// What the journal tests share: a private system root, file helpers, the
+// producer command and a view of the kernel's lock table.
+#include <sys/stat.h>
+#include <sys/wait.h>
+
+#include <chrono>
+#include <fstream>
 #include <functional>
+#include <sstream>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include <gtest/gtest.h>
 #include <wx/arrstr.h>
 #include <wx/string.h>
 
+#include "TempFolder.h"
 #include "data/JobReadWriter.h"
 
 namespace journaltest
 {
 
-// A fresh system root for one test: WYX_SYSTEM_ROOT points into a new
-// temporary folder, which holds the data directory and the lock folder.
-class JournalTest : public ::testing::Test
-{
-protected:
-    void SetUp() override;
-    void TearDown() override;
-
-    std::string Root() const { return m_root; }
-    // The data directory below the root, created.
-    std::string DataDirectory() const;
-    std::string StatusJournal() const { return DataDirectory() + "TiveraJobsStatusFile.txt"; }
-    std::string LogJournal() const { return DataDirectory() + "TiveraJobsLogFile.txt"; }
-    std::string LockFile(const std::string& name) const { return m_root + "/dev/shm/" + name + ".lock"; }
-
-private:
-    std::string m_root;
-};
-
-void WriteBytes(const std::string& path, const std::string& bytes);
-std::string ReadBytes(const std::string& path);
-bool Exists(const std::string& path);
-// Names in a folder other than "." and "..".
-std::vector<std::string> FolderEntries(const std::string& folder);
-
-std::string Utf8(const wxString& text);
-wxString FromUtf8(const std::string& text);
-std::vector<std::string> Utf8Lines(const wxArrayString& lines);
-
-// A reader-writer of the given journal, as the models and the tool make it.
-wyx::JobsFileReadWriter Journal(const std::string& path);
-// ReadJobs as UTF-8 strings; fails the test when the result is not JobOk.
-std::vector<std::string> ReadLines(const std::string& path);
+namespace fs = std::filesystem;
+using Lines = std::vector<std::string>;
+using Arguments = std::vector<std::string>;
 
 struct ToolRun
 {
     int status = -1;
     std::string out;
 };
-// Runs wyx-journal with the arguments through sh; prefix is shell text put
-// before the command (ulimit, trap).
-ToolRun RunTool(const std::vector<std::string>& arguments, const std::string& prefix = std::string());
-// RunTool as another user (root only: through util-linux setpriv).
-ToolRun RunToolAs(unsigned uid, const std::vector<std::string>& arguments);
-std::string ShellQuoted(const std::string& text);
 
-// Polls the kernel's lock table until some process or thread is blocked
-// waiting for the lock file (true), or until finished() says the candidate
-// waiter has already returned without waiting (false).
-bool WaitUntilBlockedOn(const std::string& lockFile, const std::function<bool()>& finished);
-
-// Another process (util-linux flock) holding a lock file until Release.
-class ExternalLockHolder
+// A fresh system root for one test: WYX_SYSTEM_ROOT names a new temporary
+// folder, which holds the data directory and the lock folder.
+class JournalTest : public ::testing::Test
 {
+protected:
+    void SetUp() override { fs::create_directories(DataDirectory()); }
+
+    std::string Root() const { return folder.Path().string(); }
+    std::string DataDirectory() const { return Root() + "/var/lib/Corvane/HotFolders/"; }
+    std::string StatusJournal() const { return DataDirectory() + "TiveraJobsStatusFile.txt"; }
+    std::string LogJournal() const { return DataDirectory() + "TiveraJobsLogFile.txt"; }
+    std::string LockFile(const std::string& name) const { return Root() + "/dev/shm/" + name + ".lock"; }
+
 public:
-    // Returns once the other process holds the lock.
-    explicit ExternalLockHolder(const std::string& lockFile);
-    ~ExternalLockHolder();
-    ExternalLockHolder(const ExternalLockHolder&) = delete;
-    ExternalLockHolder& operator=(const ExternalLockHolder&) = delete;
+    static void WriteBytes(const std::string& path, const std::string& bytes)
+    {
+        ASSERT_TRUE((std::ofstream(path, std::ios::binary | std::ios::trunc) << bytes).good()) << path;
+    }
+    static std::string ReadBytes(const std::string& path)
+    {
+        std::ostringstream content;
+        content << std::ifstream(path, std::ios::binary).rdbuf();
+        return content.str();
+    }
+    static Lines FolderEntries(const std::string& folder)
+    {
+        Lines names;
+        for (const auto& entry : fs::directory_iterator(folder))
+            names.push_back(entry.path().filename().string());
+        return names;
+    }
+    static std::string Utf8(const wxString& text) { return text.utf8_string(); }
+    static wxString FromUtf8(const std::string& text) { return wxString::FromUTF8(text.data(), text.size()); }
+    static Lines Utf8Lines(const wxArrayString& lines)
+    {
+        Lines result;
+        for (const wxString& line : lines)
+            result.push_back(Utf8(line));
+        return result;
+    }
 
-    bool Holding() const { return m_holding; }
-    // Lets the other process end; its lock goes with it.
-    void Release();
+    // A reader-writer of the journal, as the models and the tool make it.
+    static wyx::JobsFileReadWriter Journal(const std::string& path)
+    {
+        wyx::JobsFileReadWriter journal;
+        journal.SetPath(FromUtf8(path));
+        return journal;
+    }
+    // ReadJobs as UTF-8; fails the test unless the result is JobOk.
+    static Lines ReadLines(const std::string& path)
+    {
+        wxArrayString lines;
+        EXPECT_EQ(Journal(path).ReadJobs(lines), wyx::JobOk) << path;
+        return Utf8Lines(lines);
+    }
 
-private:
-    std::string m_releaseFifo;
-    std::FILE* m_process = nullptr;
-    bool m_holding = false;
+    static std::string Quoted(const std::string& text)
+    {
+        std::string quoted = "'";
+        for (char c : text)
+            quoted += c == '\'' ? std::string("'\\''") : std::string(1, c);
+        return quoted + "'";
+    }
+    // Runs a command through sh with the arguments quoted, collecting its output.
+    static ToolRun Run(std::string command, const Arguments& arguments)
+    {
+        for (const std::string& argument : arguments)
+            command += " " + Quoted(argument);
+        ToolRun run;
+        std::FILE* process = ::popen(command.c_str(), "r");
+        char block[4096];
+        for (std::size_t got; process && (got = std::fread(block, 1, sizeof block, process)) > 0;)
+            run.out.append(block, got);
+        const int status = process ? ::pclose(process) : -1;
+        run.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+        return run;
+    }
+    // wyx-journal; prefix is shell text put before it (ulimit, redirections).
+    static ToolRun RunTool(const Arguments& arguments, const std::string& prefix = "")
+    {
+        return Run(prefix + " exec " + Quoted(WYX_JOURNAL_TOOL), arguments);
+    }
+    // wyx-journal as another user (root only).
+    static ToolRun RunToolAs(unsigned uid, const Arguments& arguments)
+    {
+        const std::string id = std::to_string(uid);
+        return Run("exec setpriv --reuid=" + id + " --regid=" + id + " --clear-groups " +
+                       Quoted(WYX_JOURNAL_TOOL),
+                   arguments);
+    }
+
+    // Polls the kernel's lock table until someone is blocked waiting for the
+    // lock file (true), or until finished() says the candidate returned (false).
+    static bool WaitUntilBlockedOn(const std::string& lockFile, const std::function<bool()>& finished)
+    {
+        struct stat info;
+        // A waiter's line reads "N: -> FLOCK ADVISORY WRITE <pid> <maj:min:inode> 0 EOF".
+        const std::string inode =
+            ::stat(lockFile.c_str(), &info) == 0 ? ":" + std::to_string(info.st_ino) + " " : "";
+        while (!inode.empty() && !finished())
+        {
+            std::ifstream locks("/proc/locks");
+            for (std::string line; std::getline(locks, line);)
+                if (line.find("->") != std::string::npos && line.find(inode) != std::string::npos)
+                    return true;
+            std::this_thread::sleep_for(std::chrono::milliseconds(1));
+        }
+        return false;
+    }
+
+    TempFolder folder;
+    ScopedEnv root{"WYX_SYSTEM_ROOT", folder.Path().string()};
 };
 
 } // namespace journaltest
