@@ -13,39 +13,26 @@ namespace
 
 std::vector<wxString> g_asserts;
 
-void RecordAssert(const wxString& file, int line, const wxString& func, const wxString& cond,
-                  const wxString& msg)
-{
-    g_asserts.push_back(msg.empty() ? cond : msg);
-}
-
-TEST(NoLog, IsTheTargetTheTraitsCreate)
+TEST(NoLog, IsTheTraitsTargetAndDropsEveryMessageWithoutComplaint)
 {
     WyxAppTraits traits;
     std::unique_ptr<wxLog> target(traits.CreateLogTarget());
-    EXPECT_NE(dynamic_cast<NoLog*>(target.get()), nullptr);
-}
-
-TEST(NoLog, DropsEveryMessageWithoutComplaint)
-{
+    ASSERT_NE(dynamic_cast<NoLog*>(target.get()), nullptr);
     // Assertions stay on here, so a target that left the text to the base
     // class would be caught complaining.
-    g_asserts.clear();
-    const wxAssertHandler_t previousHandler = wxSetAssertHandler(RecordAssert);
+    const wxAssertHandler_t previousHandler =
+        wxSetAssertHandler([](const wxString&, int, const wxString&, const wxString& cond,
+                              const wxString& msg) { g_asserts.push_back(msg.empty() ? cond : msg); });
     const bool wasEnabled = wxLog::EnableLogging(true);
     const wxLogLevel previousLevel = wxLog::GetLogLevel();
     wxLog::SetLogLevel(wxLOG_Info);
-    NoLog* target = new NoLog;
-    wxLog* const previousTarget = wxLog::SetActiveTarget(target);
-
+    wxLog* const previousTarget = wxLog::SetActiveTarget(target.get());
     wxLogError("cannot open file '%s'", "wyx_folder.ico");
     wxLogWarning("catalog '%s' not found", "wyx3");
     wxLogMessage("message");
     wxLogInfo("information");
     wxLog::FlushActive();
-
     wxLog::SetActiveTarget(previousTarget);
-    delete target;
     wxLog::SetLogLevel(previousLevel);
     wxLog::EnableLogging(wasEnabled);
     wxSetAssertHandler(previousHandler);

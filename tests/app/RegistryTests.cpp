@@ -1,29 +1,28 @@
+// The registry file, and the install path and crash reporter folder read from it.
 #include <sys/stat.h>
 
 #include <gtest/gtest.h>
 
 #include "TempFolder.h"
+#include "app/InstallPath.h"
 #include "platform/os/Registry.h"
 
 namespace
 {
 
 const char* const kCrashKey = "SOFTWARE\\Kelvo Systems\\CrashReporter";
+const std::string kCrash = "[SOFTWARE\\Kelvo Systems\\CrashReporter]\n";
+const std::string kTwoKeys = kCrash +
+                             "InstallPath=/opt/crash\n[SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve]\n"
+                             "InstallPath=/opt/kelvo\n";
 
 struct ParseCase
 {
-    const char* title;
-    const char* text;
+    std::string text;
     const char* key;
     const char* name;
-    bool found;
-    const char* value;
+    const char* value; // null: none found
 };
-
-void PrintTo(const ParseCase& c, std::ostream* out)
-{
-    *out << c.title;
-}
 
 class RegistryParsing : public ::testing::TestWithParam<ParseCase>
 {
@@ -32,109 +31,86 @@ class RegistryParsing : public ::testing::TestWithParam<ParseCase>
 TEST_P(RegistryParsing, FindsExactlyTheValuesTheFileHolds)
 {
     const ParseCase& c = GetParam();
-    const wyxos::RegistryFile file = wyxos::RegistryFile::Parse(wxString::FromUTF8(c.text));
     wxString value = "untouched";
-    EXPECT_EQ(file.QueryValue(wxString::FromUTF8(c.key), wxString::FromUTF8(c.name), value), c.found);
-    EXPECT_EQ(value, c.found ? wxString::FromUTF8(c.value) : wxString("untouched"));
+    EXPECT_EQ(wyxos::RegistryFile::Parse(wxString::FromUTF8(c.text))
+                  .QueryValue(wxString::FromUTF8(c.key), wxString::FromUTF8(c.name), value),
+              c.value != nullptr);
+    EXPECT_EQ(value, wxString::FromUTF8(c.value ? c.value : "untouched"));
 }
-
-const char* const kTwoKeys = "[SOFTWARE\\Kelvo Systems\\CrashReporter]\n"
-                             "InstallPath=/opt/crash\n"
-                             "[SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve]\n"
-                             "InstallPath=/opt/kelvo\n";
 
 INSTANTIATE_TEST_SUITE_P(
     Cases, RegistryParsing,
     ::testing::Values(
-        ParseCase{"first of two keys", kTwoKeys, kCrashKey, "InstallPath", true, "/opt/crash"},
-        ParseCase{"second of two keys", kTwoKeys, "SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve",
-                  "InstallPath", true, "/opt/kelvo"},
-        ParseCase{"missing section", kTwoKeys, "SOFTWARE\\Kelvo Systems\\Other", "InstallPath", false, ""},
-        ParseCase{"missing value", kTwoKeys, kCrashKey, "Version", false, ""},
-        ParseCase{"empty file", "", kCrashKey, "InstallPath", false, ""},
-        ParseCase{"key and name without regard to case", kTwoKeys, "software\\KELVO systems\\crashreporter",
-                  "installpath", true, "/opt/crash"},
-        ParseCase{"CRLF line ends", "[SOFTWARE\\Kelvo Systems\\CrashReporter]\r\nInstallPath=/opt/crash\r\n",
-                  kCrashKey, "InstallPath", true, "/opt/crash"},
-        ParseCase{"blanks around names, values and headers",
-                  "  \n\t[SOFTWARE\\Kelvo Systems\\CrashReporter]  \n  InstallPath  =  /opt/with space  \n\n",
-                  kCrashKey, "InstallPath", true, "/opt/with space"},
-        ParseCase{"blanks inside the key path count",
-                  "[SOFTWARE\\Kelvo Systems\\ CrashReporter]\nInstallPath=/x\n", kCrashKey, "InstallPath",
-                  false, ""},
-        ParseCase{"empty value is a value", "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=\n",
-                  kCrashKey, "InstallPath", true, ""},
-        ParseCase{"'=' inside the value", "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=/a=b\n",
-                  kCrashKey, "InstallPath", true, "/a=b"},
-        ParseCase{"later line wins",
-                  "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=/a\nInstallPath=/b\n", kCrashKey,
-                  "InstallPath", true, "/b"},
-        ParseCase{"a section given twice adds up",
-                  "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nA=1\n[Other]\nB=2\n"
-                  "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=/c\n",
-                  kCrashKey, "A", true, "1"},
-        ParseCase{"comments are skipped",
-                  "; a comment\n# another\n[SOFTWARE\\Kelvo Systems\\CrashReporter]\n;InstallPath=/no\n",
-                  kCrashKey, "InstallPath", false, ""},
-        ParseCase{"values before any section belong to none", "InstallPath=/orphan\n", "", "InstallPath",
-                  false, ""},
-        ParseCase{"a broken header ends the section",
-                  "[SOFTWARE\\Kelvo Systems\\CrashReporter]\n[broken\nInstallPath=/x\n", kCrashKey,
-                  "InstallPath", false, ""},
-        ParseCase{"line without '=' is skipped", "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath\n",
-                  kCrashKey, "InstallPath", false, ""},
-        ParseCase{"non-ASCII value",
-                  "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=/opt/k\xC3\xA9lvo\n", kCrashKey,
-                  "InstallPath", true, "/opt/k\xC3\xA9lvo"}));
+        ParseCase{kTwoKeys, kCrashKey, "InstallPath", "/opt/crash"},
+        ParseCase{kTwoKeys, "SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve", "InstallPath", "/opt/kelvo"},
+        ParseCase{kTwoKeys, "SOFTWARE\\Kelvo Systems\\Other", "InstallPath", nullptr},
+        ParseCase{kTwoKeys, kCrashKey, "Version", nullptr}, ParseCase{"", kCrashKey, "InstallPath", nullptr},
+        // Key and name without regard to case.
+        ParseCase{kTwoKeys, "software\\KELVO systems\\crashreporter", "installpath", "/opt/crash"},
+        ParseCase{"[SOFTWARE\\Kelvo Systems\\CrashReporter]\r\nInstallPath=/c\r\n", kCrashKey, "InstallPath",
+                  "/c"},
+        // Blanks around names, values and headers go; blanks inside the key path count.
+        ParseCase{"  \n\t" + kCrash + "  \n  InstallPath  =  /opt/with space  \n\n", kCrashKey, "InstallPath",
+                  "/opt/with space"},
+        ParseCase{"[SOFTWARE\\Kelvo Systems\\ CrashReporter]\nInstallPath=/x\n", kCrashKey, "InstallPath",
+                  nullptr},
+        ParseCase{kCrash + "InstallPath=\n", kCrashKey, "InstallPath", ""},
+        ParseCase{kCrash + "InstallPath=/a=b\n", kCrashKey, "InstallPath", "/a=b"},
+        ParseCase{kCrash + "InstallPath=/a\nInstallPath=/b\n", kCrashKey, "InstallPath", "/b"},
+        ParseCase{kCrash + "A=1\n[Other]\nB=2\n" + kCrash + "InstallPath=/c\n", kCrashKey, "A", "1"},
+        ParseCase{"; a comment\n# another\n" + kCrash + ";InstallPath=/no\n", kCrashKey, "InstallPath",
+                  nullptr},
+        ParseCase{"InstallPath=/orphan\n", "", "InstallPath", nullptr},
+        ParseCase{kCrash + "[broken\nInstallPath=/x\n", kCrashKey, "InstallPath", nullptr},
+        ParseCase{kCrash + "InstallPath\n", kCrashKey, "InstallPath", nullptr},
+        ParseCase{kCrash + "InstallPath=/opt/k\xC3\xA9lvo\n", kCrashKey, "InstallPath",
+                  "/opt/k\xC3\xA9lvo"}));
 
-class RegistryFileOnDisk : public ::testing::Test
+TEST(RegistryFile, IsReadBelowTheSystemRootInItsEncodingAndNeverFromAFifoOrFolder)
 {
-protected:
     TempFolder folder;
-};
-
-TEST_F(RegistryFileOnDisk, MissingFileHasNoValues)
-{
-    wxString value;
-    EXPECT_FALSE(wyxos::RegistryFile::Load(folder.Path().string() + "/absent.ini")
-                     .QueryValue(kCrashKey, "InstallPath", value));
-}
-
-TEST_F(RegistryFileOnDisk, AFolderOrAFifoInPlaceOfTheFileIsRefusedWithoutWaiting)
-{
-    std::filesystem::create_directories(folder.Path() / "folder.ini");
-    const std::string fifo = (folder.Path() / "fifo.ini").string();
-    ASSERT_EQ(::mkfifo(fifo.c_str(), 0600), 0);
-    wxString value;
-    EXPECT_FALSE(wyxos::RegistryFile::Load((folder.Path() / "folder.ini").string())
-                     .QueryValue(kCrashKey, "InstallPath", value));
-    // A writer that never comes would block a plain open() for ever.
-    EXPECT_FALSE(wyxos::RegistryFile::Load(fifo).QueryValue(kCrashKey, "InstallPath", value));
-}
-
-TEST_F(RegistryFileOnDisk, ByteOrderMarkAndLatin1AreRead)
-{
-    const auto bom =
-        folder.Write("bom.ini", "\xEF\xBB\xBF[SOFTWARE\\Kelvo Systems\\CrashReporter]\r\nInstallPath=/a\r\n");
-    const auto latin1 =
-        folder.Write("latin1.ini", "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=/k\xE9lvo\n");
-    wxString value;
-    ASSERT_TRUE(wyxos::RegistryFile::Load(bom.string()).QueryValue(kCrashKey, "InstallPath", value));
-    EXPECT_EQ(value, "/a");
-    ASSERT_TRUE(wyxos::RegistryFile::Load(latin1.string()).QueryValue(kCrashKey, "InstallPath", value));
-    EXPECT_EQ(value, wxString::FromUTF8("/k\xC3\xA9lvo"));
-}
-
-TEST_F(RegistryFileOnDisk, ValuesAreReadBelowTheSystemRoot)
-{
     ScopedEnv root("WYX_SYSTEM_ROOT", folder.Path().string());
     EXPECT_EQ(wyxos::RegistryFilePath(), wxString(folder.Path().string() + "/etc/kelvo/registry.ini"));
     wxString value;
     EXPECT_FALSE(wyxos::ReadRegistryValue(kCrashKey, "InstallPath", value));
-    folder.Write("etc/kelvo/registry.ini",
-                 "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=/opt/crash\n");
-    ASSERT_TRUE(wyxos::ReadRegistryValue(kCrashKey, "InstallPath", value));
-    EXPECT_EQ(value, "/opt/crash");
+    // A FIFO whose writer never comes would block a plain open() for ever.
+    std::filesystem::create_directories(folder.Path() / "etc/kelvo/registry.ini");
+    EXPECT_FALSE(wyxos::ReadRegistryValue(kCrashKey, "InstallPath", value));
+    std::filesystem::remove(folder.Path() / "etc/kelvo/registry.ini");
+    ASSERT_EQ(::mkfifo((folder.Path() / "etc/kelvo/registry.ini").c_str(), 0600), 0);
+    EXPECT_FALSE(wyxos::ReadRegistryValue(kCrashKey, "InstallPath", value));
+    std::filesystem::remove(folder.Path() / "etc/kelvo/registry.ini");
+    for (const auto& [text, expected] :
+         {std::pair<std::string, const char*>{"\xEF\xBB\xBF" + kCrash + "InstallPath=/a\r\n", "/a"},
+          {kCrash + "InstallPath=/k\xE9lvo\n", "/k\xC3\xA9lvo"}})
+    {
+        folder.Write("etc/kelvo/registry.ini", text);
+        ASSERT_TRUE(wyxos::ReadRegistryValue(kCrashKey, "InstallPath", value)) << expected;
+        EXPECT_EQ(value, wxString::FromUTF8(expected));
+    }
+}
+
+TEST(InstallPath, IsTheRegistryValueIfItFitsTheValueBuffer)
+{
+    TempFolder folder;
+    ScopedEnv root("WYX_SYSTEM_ROOT", folder.Path().string());
+    EXPECT_EQ(ReadInstallPath(), "");
+    // 517 bytes hold 257 UTF-16 units and the terminator; U+1F5A8 takes two units.
+    const std::string longest = "/" + std::string(256, 'a'), printer = "\xF0\x9F\x96\xA8";
+    const std::string key = "[SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve]\n";
+    for (const auto& [text, expected] : std::vector<std::pair<std::string, std::string>>{
+             {key + "InstallPath=/opt/kelvo/Corvane\n", "/opt/kelvo/Corvane"},
+             {kCrash + "InstallPath=/opt/crash\n", ""},
+             {key + "Version=3\n", ""},
+             {key + "InstallPath=" + longest + "\n", longest},
+             {key + "InstallPath=" + longest + "b\n", ""},
+             {key + "InstallPath=/" + std::string(254, 'a') + printer + "\n",
+              "/" + std::string(254, 'a') + printer},
+             {key + "InstallPath=/" + std::string(255, 'a') + printer + "\n", ""}})
+    {
+        folder.Write("etc/kelvo/registry.ini", text);
+        EXPECT_EQ(ReadInstallPath(), wxString::FromUTF8(expected)) << text;
+    }
 }
 
 } // namespace
