@@ -1,301 +1,265 @@
-// Selection, focus, keyboard, header clicks and column resizing, driven by
-// events sent to the windows' handlers; the list events are checked in order.
+// Selection, focus, keyboard, scrolling, header clicks and column resizing,
+// driven by events sent to the windows' handlers; list events checked in order.
 #include "ListTestSupport.h"
 
 #include <wx/imaglist.h>
 
+#include <algorithm>
 #include <memory>
+#include <sstream>
+#include <tuple>
 
 using namespace listtest;
 
 namespace
 {
+// A script of steps "action|events|state;": an action of the user or the
+// program (see Do), the list events it sends ("*": not checked), and the state
+// after it: the selected rows in order, unless "#n" gives their number; "@i" the
+// focused row, "^i" the top row ("^$": the last page). A row may count pages:
+// "2p-1" is two pages less one row.
 class ListInput : public ListFixture
 {
 protected:
     void Build(long style, long items)
     {
-        m_list = MakeList(wxLC_REPORT | style);
-        m_list->InsertColumn(0, wxS("Name"), wxLIST_FORMAT_LEFT, 100);
-        m_list->InsertColumn(1, wxS("Size"), wxLIST_FORMAT_LEFT, 100);
-        if (style & wxLC_VIRTUAL)
-            m_list->SetItemCount(items);
-        else
-            for (long item = 0; item < items; ++item)
-                m_list->InsertItem(item, wxString::Format("row %ld", item));
+        m_list = MakeRows(style, {100, 100}, items);
         m_rows = m_list->GetMainWindow();
-        m_rows->LayoutIfNeeded();
         m_events = std::make_unique<EventLog>(m_list);
     }
 
-    void Click(long item, bool ctrl = false, bool shift = false)
+    long Item(const std::string& text) const
     {
-        const int lh = m_rows->GetLineHeight();
-        SendMouse(m_rows, wxEVT_LEFT_DOWN, 50, static_cast<int>((item - m_rows->GetTopItem()) * lh + lh / 2),
-                  ctrl, shift);
-        SendMouse(m_rows, wxEVT_LEFT_UP, 50, static_cast<int>((item - m_rows->GetTopItem()) * lh + lh / 2),
-                  ctrl, shift);
+        const size_t p = text.find('p');
+        if (p == std::string::npos)
+            return std::stol(text);
+        const long pages = p == 0 ? 1 : std::stol(text.substr(0, p));
+        return pages * m_rows->GetCountPerPage() + (p + 1 < text.size() ? std::stol(text.substr(p + 1)) : 0);
     }
 
-    std::vector<long> SelectedItems() const
+    // "click c+s+3" (with Ctrl and Shift), "rclick 3", "dclick 3", "key c+a", "scroll pagedown",
+    // "select 3", "focus 3" (and select), "clear 3" (neither), "count 5", "top 50", "wheel -120".
+    void Do(const std::string& action)
     {
-        std::vector<long> items;
+        std::istringstream in(action);
+        std::string verb, arg;
+        in >> verb >> arg;
+        const bool ctrl = arg.find("c+") != std::string::npos;
+        const bool shift = arg.find("s+") != std::string::npos;
+        arg = arg.substr(arg.rfind('+') + 1);
+        const std::string names =
+            " down up pgdn pgup home end space enter a click rclick dclick top bottom lineup "
+            "linedown pageup pagedown ";
+        const int keys[] = {WXK_DOWN, WXK_UP,    WXK_PAGEDOWN, WXK_PAGEUP, WXK_HOME,
+                            WXK_END,  WXK_SPACE, WXK_RETURN,   'A'};
+        const int events[] = {wxEVT_LEFT_DOWN,          wxEVT_RIGHT_DOWN,       wxEVT_LEFT_DCLICK,
+                              wxEVT_SCROLLWIN_TOP,      wxEVT_SCROLLWIN_BOTTOM, wxEVT_SCROLLWIN_LINEUP,
+                              wxEVT_SCROLLWIN_LINEDOWN, wxEVT_SCROLLWIN_PAGEUP, wxEVT_SCROLLWIN_PAGEDOWN};
+        const auto code = [&](const std::string& name)
+        {
+            const auto at = std::count(names.begin(), names.begin() + names.find(" " + name + " "), ' ');
+            return at < 9 ? keys[at] : events[at - 9];
+        };
+        const long all = wxLIST_STATE_SELECTED | wxLIST_STATE_FOCUSED;
+        m_rows->LayoutIfNeeded();
+        const long item = verb == "key" || verb == "scroll" ? 0 : Item(arg);
+        const int lh = m_rows->GetLineHeight();
+        wxMouseEvent wheel(wxEVT_MOUSEWHEEL);
+        wheel.m_wheelRotation = static_cast<int>(item);
+        wheel.m_wheelDelta = 120;
+        wheel.m_linesPerAction = 3;
+        wxScrollWinEvent scroll(verb == "scroll" ? code(arg) : 0, 0, wxVERTICAL);
+        if (verb.find("click") != std::string::npos)
+            SendMouse(m_rows, code(verb), 50, int((item - m_rows->GetTopItem()) * lh + lh / 2), ctrl, shift);
+        else if (verb == "key")
+            SendKey(m_rows, code(arg), ctrl, shift);
+        else if (verb == "select")
+            m_list->SetItemState(item, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
+        else if (verb == "focus" || verb == "clear")
+            m_list->SetItemState(item, verb == "focus" ? all : 0, all);
+        else if (verb == "count")
+            m_list->SetItemCount(item);
+        else if (verb == "top")
+            m_rows->ScrollToTop(item);
+        else
+            m_rows->GetEventHandler()->ProcessEvent(verb == "wheel" ? static_cast<wxEvent&>(wheel) : scroll);
+    }
+
+    void Run(const std::string& script)
+    {
+        std::istringstream steps(script);
+        for (std::string action, events, state; std::getline(steps, action, '|') &&
+                                                std::getline(steps, events, '|') &&
+                                                std::getline(steps, state, ';');)
+        {
+            action = action.substr(action.find_first_not_of(' '));
+            SCOPED_TRACE(action);
+            Do(action);
+            const std::string sent = m_events->Take();
+            if (events != "*")
+                EXPECT_EQ(sent, events);
+            std::istringstream in(state);
+            std::string selected;
+            bool counted = false;
+            for (std::string token; in >> token;)
+            {
+                const std::string rest = token.substr(1);
+                if (token[0] == '@')
+                    EXPECT_EQ(m_list->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_FOCUSED), Item(rest));
+                else if (token[0] == '#' && (counted = true))
+                    EXPECT_EQ(m_list->GetSelectedItemCount(), Item(rest));
+                else if (token == "^$")
+                    EXPECT_EQ(m_rows->GetTopItem() + m_rows->GetCountPerPage(), m_list->GetItemCount());
+                else if (token[0] == '^')
+                    EXPECT_EQ(m_rows->GetTopItem(), Item(rest));
+                else
+                    selected += (selected.empty() ? "" : " ") + std::to_string(Item(token));
+            }
+            if (!counted)
+                EXPECT_EQ(Selected(), selected);
+        }
+    }
+
+    std::string Selected() const
+    {
+        std::string items;
         for (long item = m_list->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED); item >= 0;
              item = m_list->GetNextItem(item, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED))
-            items.push_back(item);
+            items += (items.empty() ? "" : " ") + std::to_string(item);
         return items;
     }
-
-    long FocusedItem() const { return m_list->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_FOCUSED); }
 
     ProfilesKelvoProfilesListCtrl* m_list = nullptr;
     ProfilesKelvoListMainWindow* m_rows = nullptr;
     std::unique_ptr<EventLog> m_events;
 };
 
-using Events = std::vector<EventRecord>;
-
-TEST_F(ListInput, SingleSelectionClickMovesTheOneSelectedRow)
+TEST_F(ListInput, SingleSelectionKeepsOneSelectedRow)
 {
     Build(wxLC_SINGLE_SEL, 20);
-    Click(2);
-    EXPECT_EQ(m_events->Take(), (Events{Focused(2), Selected(2)}));
-    Click(4);
-    EXPECT_EQ(m_events->Take(), (Events{Deselected(2), Focused(4), Selected(4)}));
-    Click(5, true);
-    EXPECT_EQ(m_events->Take(), (Events{Deselected(4), Focused(5), Selected(5)})) << "Ctrl adds nothing";
-    Click(5);
-    EXPECT_EQ(m_events->Take(), Events{}) << "clicking the selected row changes nothing";
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{5}));
-    EXPECT_EQ(m_list->GetSelectedItemCount(), 1);
+    Run("click 2|F2 S2|2 @2; click 4|D2 F4 S4|4; click c+5|D4 F5 S5|5; click 5||5; key c+a|K5|5;"
+        "select 7|D5 S7|7 @5; select 7||7; rclick 3|D7 F3 S3 R3|3 @3;");
 }
 
-TEST_F(ListInput, MultipleSelectionWithCtrlAndShift)
+TEST_F(ListInput, MultipleSelectionByMouseAndKeys)
 {
     Build(0, 10);
-    Click(1);
-    Click(3, true);
-    EXPECT_EQ(m_events->Take(), (Events{Focused(1), Selected(1), Focused(3), Selected(3)}));
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{1, 3}));
-
-    Click(5, false, true);
-    EXPECT_EQ(m_events->Take(), (Events{Deselected(1), Focused(5), Selected(4), Selected(5)}));
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{3, 4, 5}));
-
-    Click(4, true);
-    EXPECT_EQ(m_events->Take(), (Events{Focused(4), Deselected(4)}));
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{3, 5}));
-
-    // Below the last row: a plain click clears the selection.
-    SendMouse(m_rows, wxEVT_LEFT_DOWN, 50, m_rows->GetClientSize().GetHeight() - 2);
-    ASSERT_LT(m_list->GetItemCount() * m_rows->GetLineHeight(), m_rows->GetClientSize().GetHeight());
-    EXPECT_EQ(m_events->Take(), (Events{Deselected(3), Deselected(5)}));
-    EXPECT_EQ(m_list->GetSelectedItemCount(), 0);
-}
-
-TEST_F(ListInput, ArrowsHomeEndAndPagesMoveTheSelectedRow)
-{
-    Build(wxLC_SINGLE_SEL, 200);
-    const long page = m_rows->GetCountPerPage();
-    ASSERT_GT(page, 2);
-
-    SendKey(m_rows, WXK_DOWN);
-    EXPECT_EQ(m_events->Take(), (Events{KeyDown(-1), Focused(0), Selected(0)}));
+    ASSERT_LT(11 * m_rows->GetLineHeight(), m_rows->GetClientSize().GetHeight()) << "room under the last row";
+    Run("click 1|F1 S1|1; click c+3|F3 S3|1 3; click s+5|D1 F5 S4 S5|3 4 5; click c+4|F4 D4|3 5;"
+        "click 2|D3 D5 F2 S2|2; key s+down|K2 F3 S3|2 3; key s+down|K3 F4 S4|2 3 4; key s+up|K4 D4 F3|2 3;"
+        "key c+down|K3 F4|2 3 @4; key c+down|K4 F5|2 3 @5; key c+space|K5 S5|2 3 5; key c+space|K5 D5|2 3;"
+        "key c+down|K5 F6|2 3; key space|K6 S6|2 3 6; key enter|K6 A6|2 3 6; dclick 7|A7|2 3 6;"
+        "key c+a|K6 S0 S1 S4 S5 S7 S8 S9|0 1 2 3 4 5 6 7 8 9; key down|*|7 @7; click c+5|F5 S5|5 7;"
+        "click 10|D5 D7|;");
     EXPECT_EQ(m_events->lastKeyCode, WXK_DOWN);
-    SendKey(m_rows, WXK_DOWN);
-    EXPECT_EQ(m_events->Take(), (Events{KeyDown(0), Deselected(0), Focused(1), Selected(1)}));
-    SendKey(m_rows, WXK_UP);
-    SendKey(m_rows, WXK_UP);
-    EXPECT_EQ(FocusedItem(), 0) << "Up stops at the first row";
-
-    struct Step
-    {
-        int key;
-        long expected;
-    };
-    for (const Step& step :
-         {Step{WXK_PAGEDOWN, page - 1}, Step{WXK_PAGEDOWN, 2 * (page - 1)}, Step{WXK_PAGEUP, page - 1},
-          Step{WXK_END, 199}, Step{WXK_DOWN, 199}, Step{WXK_HOME, 0}})
-    {
-        SendKey(m_rows, step.key);
-        EXPECT_EQ(FocusedItem(), step.expected) << "key " << step.key;
-        EXPECT_EQ(SelectedItems(), (std::vector<long>{step.expected})) << "key " << step.key;
-        EXPECT_LE(m_rows->GetTopItem(), step.expected) << "the row is scrolled into view";
-        EXPECT_GT(m_rows->GetTopItem() + page, step.expected) << "the row is scrolled into view";
-    }
 }
 
-TEST_F(ListInput, ShiftExtendsCtrlMovesTheFocusAloneAndCtrlAAll)
-{
-    Build(0, 20);
-    Click(2);
-    SendKey(m_rows, WXK_DOWN, false, true);
-    SendKey(m_rows, WXK_DOWN, false, true);
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{2, 3, 4}));
-    SendKey(m_rows, WXK_UP, false, true);
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{2, 3}));
-
-    SendKey(m_rows, WXK_DOWN, true);
-    SendKey(m_rows, WXK_DOWN, true);
-    EXPECT_EQ(FocusedItem(), 5);
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{2, 3}));
-    SendKey(m_rows, WXK_SPACE, true);
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{2, 3, 5}));
-    SendKey(m_rows, WXK_SPACE, true);
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{2, 3}));
-
-    SendKey(m_rows, 'A', true);
-    EXPECT_EQ(m_list->GetSelectedItemCount(), 20);
-    SendKey(m_rows, WXK_DOWN);
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{6}));
-}
-
-TEST_F(ListInput, PagesWithoutAFocusedRowStartFromThePage)
+TEST_F(ListInput, KeysMoveTheSelectedRowAndScrollItIntoView)
 {
     Build(wxLC_SINGLE_SEL, 200);
-    const long page = m_rows->GetCountPerPage();
-    SendKey(m_rows, WXK_PAGEDOWN);
-    EXPECT_EQ(FocusedItem(), page - 1) << "the last row of the page";
-    m_list->SetItemState(page - 1, 0, wxLIST_STATE_FOCUSED | wxLIST_STATE_SELECTED);
-    ASSERT_EQ(FocusedItem(), -1);
-    m_rows->ScrollToTop(50);
-    SendKey(m_rows, WXK_PAGEUP);
-    EXPECT_EQ(FocusedItem(), 50) << "the first row of the page";
+    Run("key pgdn|*|p-1 @p-1; clear p-1|*|; top 50||^50; key pgup|*|50; clear 50|*|^50; top 0||;"
+        "key down|K-1 F0 S0|0; key down|K0 D0 F1 S1|1; key up|*|0; key up|*|0 @0; key pgdn|*|p-1 ^0;"
+        "key pgdn|*|2p-2 ^p-1; key pgup|*|p-1 ^p-1; key end|*|199 ^$; key down|*|199; key home|*|0 ^0;");
 }
 
-TEST_F(ListInput, CtrlADoesNothingInASingleSelectionList)
+TEST_F(ListInput, WheelAndScrollbarMoveByLinesAndPagesAndStopAtTheEnds)
 {
-    Build(wxLC_SINGLE_SEL, 5);
-    Click(1);
-    SendKey(m_rows, 'A', true);
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{1}));
+    Build(0, 100);
+    Run("wheel -120||^3; wheel -60||^3; wheel -60||^6; wheel 1200||^0; wheel -12000||^$; scroll top||^0;"
+        "scroll linedown||^1; scroll pagedown||^p+1; scroll lineup||^p; scroll pageup||^0; scroll "
+        "bottom||^$;");
 }
 
-TEST_F(ListInput, SpaceSelectsTheFocusedRowAndEnterOrDoubleClickActivates)
-{
-    Build(0, 10);
-    Click(3);
-    SendKey(m_rows, WXK_DOWN, true);
-    m_events->Take();
-    SendKey(m_rows, WXK_SPACE);
-    EXPECT_EQ(m_events->Take(), (Events{KeyDown(4), Selected(4)}));
-    SendKey(m_rows, WXK_RETURN);
-    EXPECT_EQ(m_events->Take(), (Events{KeyDown(4), Activated(4)}));
-    const int lh = m_rows->GetLineHeight();
-    SendMouse(m_rows, wxEVT_LEFT_DCLICK, 50, 7 * lh + lh / 2);
-    EXPECT_EQ(m_events->Take(), (Events{Activated(7)}));
-}
-
-TEST_F(ListInput, ShrinkingAVirtualListDropsTheSelectionBeyondItAndClampsTheFocus)
+TEST_F(ListInput, VirtualListsKeepTheSelectionInsideTheCountAndChangeManyRowsInOneEvent)
 {
     Build(wxLC_VIRTUAL, 10);
-    m_list->SetItemState(7, wxLIST_STATE_SELECTED | wxLIST_STATE_FOCUSED,
-                         wxLIST_STATE_SELECTED | wxLIST_STATE_FOCUSED);
-    m_list->SetItemState(2, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-    ASSERT_EQ(SelectedItems(), (std::vector<long>{2, 7}));
-
-    m_list->SetItemCount(5);
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{2}));
-    EXPECT_EQ(m_list->GetSelectedItemCount(), 1);
-    EXPECT_EQ(FocusedItem(), 4);
-
-    m_list->SetItemCount(10);
-    EXPECT_EQ(m_list->GetItemState(7, wxLIST_STATE_SELECTED), 0) << "item 7 does not come back selected";
-
-    m_list->SetItemCount(0);
-    EXPECT_EQ(FocusedItem(), -1);
-    EXPECT_EQ(m_list->GetSelectedItemCount(), 0);
+    Run("focus 7|F7 S7|7 @7; select 2|S2|2 7; count 5||2 @4; count 10||2; count 0||@-1; count 100000||;"
+        "key c+a|K-1 S-1|#100000; click 3|D-1 F3|3; key s+end|*|#99997 ^$;");
 }
 
-TEST_F(ListInput, HundredThousandVirtualRowsSelectInOneStep)
-{
-    Build(wxLC_VIRTUAL, 100000);
-    SendKey(m_rows, 'A', true);
-    EXPECT_EQ(m_list->GetSelectedItemCount(), 100000);
-    EXPECT_EQ(m_events->Take(), (Events{KeyDown(-1), Selected(-1)})) << "one event for the whole range";
-    Click(3);
-    EXPECT_EQ(m_events->Take(), (Events{Deselected(-1), Focused(3)}));
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{3}));
-    SendKey(m_rows, WXK_END, false, true);
-    EXPECT_EQ(m_list->GetSelectedItemCount(), 100000 - 3);
-    EXPECT_EQ(m_rows->GetTopItem() + m_rows->GetCountPerPage(), 100000) << "the end is in view";
-}
-
-TEST_F(ListInput, DeletingAndInsertingRowsKeepsTheSelectionOnTheSameRows)
+TEST_F(ListInput, RowsKeepTheirSelectionTextsAndDataThroughInsertsAndDeletes)
 {
     Build(0, 6);
-    m_list->SetItemState(3, wxLIST_STATE_SELECTED | wxLIST_STATE_FOCUSED,
-                         wxLIST_STATE_SELECTED | wxLIST_STATE_FOCUSED);
-    m_list->InsertItem(0, wxS("new first"));
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{4}));
-    EXPECT_EQ(m_list->GetItemText(4), wxS("row 3"));
-    EXPECT_EQ(FocusedItem(), 4);
-    m_list->DeleteItem(1);
-    EXPECT_EQ(SelectedItems(), (std::vector<long>{3}));
+    Run("focus 3|F3 S3|3 @3;");
+    EXPECT_EQ(m_list->InsertItem(0, wxS("new first"), 0), 0);
+    EXPECT_TRUE(m_list->DeleteItem(2));
+    Run("focus 3||3 @3;");
     EXPECT_EQ(m_list->GetItemText(3), wxS("row 3"));
+    EXPECT_EQ(m_list->InsertItem(99, wxS("appended")), 6) << "an index past the end appends";
+    EXPECT_TRUE(m_list->SetItem(0, 1, wxS("cell")));
+    EXPECT_TRUE(m_list->SetItemData(0, 42));
+    Run("select 0|S0|0 3;");
+    wxListItem info;
+    info.SetId(0);
+    info.SetColumn(1);
+    info.SetMask(wxLIST_MASK_TEXT | wxLIST_MASK_DATA | wxLIST_MASK_STATE | wxLIST_MASK_IMAGE);
+    info.SetStateMask(wxLIST_STATE_SELECTED);
+    ASSERT_TRUE(m_list->GetItem(info));
+    EXPECT_EQ(std::make_tuple(info.GetText(), info.GetData(), info.GetState(), info.GetImage()),
+              std::make_tuple(wxString("cell"), wxUIntPtr(42), long(wxLIST_STATE_SELECTED), -1));
+    info.SetColumn(0);
+    ASSERT_TRUE(m_list->GetItem(info));
+    EXPECT_EQ(info.GetImage(), 0);
     m_list->DeleteAllItems();
-    EXPECT_EQ(m_list->GetSelectedItemCount(), 0);
-    EXPECT_EQ(FocusedItem(), -1);
     EXPECT_EQ(m_list->GetItemCount(), 0);
+    Run("top 0||@-1;");
 }
 
-// ---------------------------------------------------------------- header
-
-struct HeaderClickCase
+// An index one past the last row, or beyond it, changes nothing and reports nothing.
+TEST_F(ListInput, ItemsBeyondTheCountAreLeftAlone)
 {
-    int fromRight; // x = header width - fromRight
-    wxEventType type;
-    int expectedColumn; // -1: no event
-};
+    for (const long style : {0L, long(wxLC_VIRTUAL)})
+    {
+        Build(style, 5);
+        for (const long item : {5L, 6L})
+        {
+            SCOPED_TRACE(testing::Message() << "style " << style << ", item " << item);
+            wxRect rect;
+            EXPECT_FALSE(m_list->SetItemState(item, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED) ||
+                         m_list->SetItem(item, 0, wxS("x")) || m_list->DeleteItem(item) ||
+                         m_list->SetItemData(item, 1) || m_list->SetItemTextColour(item, *wxRED) ||
+                         m_list->EnsureVisible(item) || m_list->GetItemRect(item, rect) ||
+                         m_list->GetSubItemRect(0, 2, rect));
+            m_rows->SetItemSelected(item, true);
+            m_rows->SetCurrent(item);
+            EXPECT_EQ(m_list->GetItemState(item, wxLIST_STATE_SELECTED), 0);
+            EXPECT_EQ(m_list->GetItemText(item), wxString());
+            EXPECT_EQ(m_list->GetItemCount(), 5);
+            Run("top 0||@-1;");
+        }
+        m_frame->Destroy();
+    }
+    m_frame = nullptr;
+}
 
-class HeaderClick : public ListInput, public ::testing::WithParamInterface<HeaderClickCase>
-{
-};
-
-TEST_P(HeaderClick, ReportsTheColumnOrMinusTwoNearTheRightEdge)
+TEST_F(ListInput, HeaderClicksReportTheColumnOrMinusTwoNearTheRightEdge)
 {
     Build(0, 3);
     ProfilesKelvoListHeaderWindow* header = m_list->GetHeaderWindow();
     const int width = header->GetClientSize().GetWidth();
     ASSERT_GT(width, 300);
-    const HeaderClickCase& c = GetParam();
-    const wxEventType mouse = c.type == wxEVT_LIST_COL_CLICK ? wxEVT_LEFT_DOWN : wxEVT_RIGHT_UP;
-    SendMouse(header, mouse, width - c.fromRight, 10);
-    const Events expected =
-        c.expectedColumn == -1 ? Events{} : Events{EventRecord{c.type, -1, c.expectedColumn}};
-    EXPECT_EQ(m_events->Take(), expected);
+    // x from the left, or from the right edge when negative or "-0"; right-button releases report X.
+    const std::tuple<bool, int, bool, const char*> cases[] = {
+        {false, 50, false, "C0"}, {false, 150, false, "C1"}, {false, 150, true, "X1"},
+        {false, 250, false, ""},  {true, 10, false, "C-2"},  {true, 1, false, "C-2"},
+        {true, 19, false, "C-2"}, {true, 20, false, ""},     {true, 0, false, ""},
+        {true, 5, true, "X-2"}};
+    for (const auto& [fromRight, x, right, expected] : cases)
+    {
+        SendMouse(header, right ? wxEVT_RIGHT_UP : wxEVT_LEFT_DOWN, fromRight ? width - x : x, 10);
+        EXPECT_EQ(m_events->Take(), expected) << (fromRight ? "from the right " : "") << x;
+    }
 }
 
-INSTANTIATE_TEST_SUITE_P(Places, HeaderClick,
-                         ::testing::Values(HeaderClickCase{10, wxEVT_LIST_COL_CLICK, -2},
-                                           HeaderClickCase{1, wxEVT_LIST_COL_CLICK, -2},
-                                           HeaderClickCase{19, wxEVT_LIST_COL_CLICK, -2},
-                                           HeaderClickCase{20, wxEVT_LIST_COL_CLICK, -1},
-                                           HeaderClickCase{0, wxEVT_LIST_COL_CLICK, -1},
-                                           HeaderClickCase{5, wxEVT_LIST_COL_RIGHT_CLICK, -2}));
-
-TEST_F(ListInput, HeaderClickOnAColumnReportsIt)
+TEST_F(ListInput, DraggingABorderResizesTheColumnDownToItsMinimumUnlessVetoed)
 {
     Build(0, 3);
-    ProfilesKelvoListHeaderWindow* header = m_list->GetHeaderWindow();
-    SendMouse(header, wxEVT_LEFT_DOWN, 50, 10);
-    SendMouse(header, wxEVT_LEFT_DOWN, 150, 10);
-    SendMouse(header, wxEVT_RIGHT_UP, 150, 10);
-    EXPECT_EQ(m_events->Take(),
-              (Events{EventRecord{wxEVT_LIST_COL_CLICK, -1, 0}, EventRecord{wxEVT_LIST_COL_CLICK, -1, 1},
-                      EventRecord{wxEVT_LIST_COL_RIGHT_CLICK, -1, 1}}));
-}
-
-TEST_F(ListInput, DraggingABorderResizesTheColumnDownToItsMinimum)
-{
-    Build(0, 3);
-    std::unique_ptr<wxImageList> marks(new wxImageList(16, 16, true, 1));
-    marks->Add(wxBitmap(wxImage(16, 16)));
-    m_list->SetImageList(marks.get(), kHeaderImageList);
+    wxImageList marks(16, 16, true, 1);
+    marks.Add(wxBitmap(wxImage(16, 16)));
+    m_list->SetImageList(&marks, kHeaderImageList);
     ProfilesKelvoListHeaderWindow* header = m_list->GetHeaderWindow();
     const int minimum = header->GetTextExtent(wxS("M")).GetWidth() + 8 + 16 + 5;
     EXPECT_EQ(header->GetMinimumColumnWidth(), minimum);
-
     SendMouse(header, wxEVT_LEFT_DOWN, 100, 10);
     ASSERT_TRUE(header->IsResizing());
     SendMouse(header, wxEVT_MOTION, 150, 10, false, false, true);
@@ -306,162 +270,55 @@ TEST_F(ListInput, DraggingABorderResizesTheColumnDownToItsMinimum)
     EXPECT_FALSE(header->IsResizing());
     EXPECT_EQ(m_rows->GetResizeGuide(), -1);
     EXPECT_EQ(m_list->GetColumnWidth(0), minimum);
-    EXPECT_EQ(
-        m_events->Take(),
-        (Events{EventRecord{wxEVT_LIST_COL_BEGIN_DRAG, -1, 0}, EventRecord{wxEVT_LIST_COL_DRAGGING, -1, 0},
-                EventRecord{wxEVT_LIST_COL_DRAGGING, -1, 0}, EventRecord{wxEVT_LIST_COL_END_DRAG, -1, 0}}));
-
+    EXPECT_EQ(m_events->Take(), "B0 G0 G0 E0");
     // The second column's border moved with the first column's width.
-    const int border = minimum + 100;
-    SendMouse(header, wxEVT_LEFT_DOWN, border, 10);
-    SendMouse(header, wxEVT_LEFT_UP, border + 40, 10);
+    SendMouse(header, wxEVT_LEFT_DOWN, minimum + 100, 10);
+    SendMouse(header, wxEVT_LEFT_UP, minimum + 140, 10);
     EXPECT_EQ(m_list->GetColumnWidth(1), 140);
     m_list->SetImageList(nullptr, kHeaderImageList);
-}
 
-TEST_F(ListInput, VetoedDragLeavesTheColumnAlone)
-{
-    Build(0, 3);
     m_list->Bind(wxEVT_LIST_COL_BEGIN_DRAG, [](wxListEvent& event) { event.Veto(); });
-    ProfilesKelvoListHeaderWindow* header = m_list->GetHeaderWindow();
-    SendMouse(header, wxEVT_LEFT_DOWN, 100, 10);
+    SendMouse(header, wxEVT_LEFT_DOWN, minimum, 10);
     EXPECT_FALSE(header->IsResizing());
-    SendMouse(header, wxEVT_LEFT_UP, 160, 10);
-    EXPECT_EQ(m_list->GetColumnWidth(0), 100);
-}
-} // namespace
+    SendMouse(header, wxEVT_LEFT_UP, minimum + 60, 10);
+    EXPECT_EQ(m_list->GetColumnWidth(0), minimum);
 
-namespace
-{
-TEST_F(ListInput, WheelScrollsByLinesAndStopsAtTheEnds)
-{
-    Build(0, 100);
-    wxMouseEvent wheel(wxEVT_MOUSEWHEEL);
-    wheel.SetEventObject(m_rows);
-    wheel.m_wheelRotation = -120;
-    wheel.m_wheelDelta = 120;
-    wheel.m_linesPerAction = 3;
-    m_rows->GetEventHandler()->ProcessEvent(wheel);
-    EXPECT_EQ(m_rows->GetTopItem(), 3);
-    wheel.m_wheelRotation = -60;
-    m_rows->GetEventHandler()->ProcessEvent(wheel);
-    EXPECT_EQ(m_rows->GetTopItem(), 3) << "half a notch waits for the other half";
-    m_rows->GetEventHandler()->ProcessEvent(wheel);
-    EXPECT_EQ(m_rows->GetTopItem(), 6);
-    wheel.m_wheelRotation = 120 * 10;
-    m_rows->GetEventHandler()->ProcessEvent(wheel);
-    EXPECT_EQ(m_rows->GetTopItem(), 0);
-    wheel.m_wheelRotation = -120 * 100;
-    m_rows->GetEventHandler()->ProcessEvent(wheel);
-    EXPECT_EQ(m_rows->GetTopItem() + m_rows->GetCountPerPage(), 100);
+    m_list->InsertItem(0, wxS("a considerably longer cell text"));
+    ASSERT_TRUE(m_list->SetColumnWidth(0, wxLIST_AUTOSIZE));
+    EXPECT_EQ(m_list->GetColumnWidth(0),
+              m_rows->GetTextExtent(wxS("a considerably longer cell text")).x + 16);
+    ASSERT_TRUE(m_list->SetColumnWidth(0, wxLIST_AUTOSIZE_USEHEADER));
+    EXPECT_EQ(m_list->GetColumnWidth(0), m_rows->GetTextExtent(wxS("C0")).x + 16);
+    EXPECT_FALSE(m_list->SetColumnWidth(5, 10)) << "no such column";
 }
 
-TEST_F(ListInput, ScrollbarEventsMoveByLinesAndPages)
+TEST_F(ListInput, ColumnsWiderThanTheWindowScrollSidewaysWithTheHeader)
 {
-    Build(0, 100);
-    const long page = m_rows->GetCountPerPage();
-    struct Step
-    {
-        wxEventType type;
-        long expectedTop;
-    };
-    for (const Step& step : {Step{wxEVT_SCROLLWIN_LINEDOWN, 1}, Step{wxEVT_SCROLLWIN_PAGEDOWN, 1 + page},
-                             Step{wxEVT_SCROLLWIN_LINEUP, page}, Step{wxEVT_SCROLLWIN_BOTTOM, 100 - page},
-                             Step{wxEVT_SCROLLWIN_TOP, 0}})
-    {
-        wxScrollWinEvent event(step.type, 0, wxVERTICAL);
-        event.SetEventObject(m_rows);
-        m_rows->GetEventHandler()->ProcessEvent(event);
-        EXPECT_EQ(m_rows->GetTopItem(), step.expectedTop) << "event " << step.type;
-    }
-}
-
-TEST_F(ListInput, HeaderFollowsTheRowsWhenScrolledSideways)
-{
-    m_list = MakeList(wxLC_REPORT | wxLC_VRULES);
-    for (int column = 0; column < 3; ++column)
-        m_list->InsertColumn(column, wxS("Wide"), wxLIST_FORMAT_LEFT, 300);
-    m_list->InsertItem(0, wxString());
+    m_list = MakeRows(wxLC_VRULES, {300, 300, 300}, 1);
     m_rows = m_list->GetMainWindow();
-    m_rows->LayoutIfNeeded();
+    const int client = m_rows->GetClientSize().GetWidth();
+    EXPECT_EQ(m_rows->GetScrollRange(wxHORIZONTAL), 900);
+    EXPECT_EQ(m_rows->GetScrollThumb(wxHORIZONTAL), client);
     m_rows->ScrollToX(100);
-    ASSERT_EQ(m_rows->GetScrollX(), 100);
-
+    EXPECT_EQ(m_rows->GetScrollPos(wxHORIZONTAL), 100);
     const wxColour border = Themer::GetThemeService()->GetTheme("HeaderView").lineColour;
     const wxImage header = RenderHeader(m_list);
     EXPECT_EQ(PixelAt(header, 200, 12), border) << "first column's edge moved left by the scroll";
     EXPECT_NE(PixelAt(header, 300, 12), border);
     const wxImage rows = RenderRows(m_list);
-    const int mid = m_rows->GetLineHeight() / 2;
-    EXPECT_EQ(PixelAt(rows, 198, mid), ListTheme().lineColour);
-    EXPECT_EQ(PixelAt(rows, 498, mid), ListTheme().lineColour);
-
+    EXPECT_EQ(PixelAt(rows, 198, m_rows->GetLineHeight() / 2), ListTheme().lineColour);
+    EXPECT_EQ(PixelAt(rows, 498, m_rows->GetLineHeight() / 2), ListTheme().lineColour);
     SendKey(m_rows, WXK_LEFT);
     EXPECT_EQ(m_rows->GetScrollX(), 85);
     m_rows->ScrollToX(100000);
-    EXPECT_EQ(m_rows->GetScrollX(), 900 - m_rows->GetClientSize().GetWidth())
-        << "no scrolling past the last column";
-}
-} // namespace
-
-namespace
-{
-TEST_F(ListInput, AutosizeFitsTheWidestCellOrTheLabel)
-{
-    Build(0, 0);
-    m_list->InsertItem(0, wxS("short"));
-    m_list->InsertItem(1, wxS("a considerably longer cell text"));
-    const int widest = m_rows->GetTextExtent(wxS("a considerably longer cell text")).GetWidth();
-    ASSERT_TRUE(m_list->SetColumnWidth(0, wxLIST_AUTOSIZE));
-    EXPECT_EQ(m_list->GetColumnWidth(0), widest + 16);
-    ASSERT_TRUE(m_list->SetColumnWidth(0, wxLIST_AUTOSIZE_USEHEADER));
-    EXPECT_EQ(m_list->GetColumnWidth(0), m_rows->GetTextExtent(wxS("Name")).GetWidth() + 16);
-    EXPECT_FALSE(m_list->SetColumnWidth(5, 10)) << "no such column";
-}
-} // namespace
-
-namespace
-{
-TEST_F(ListInput, RightClickSelectsTheRowThenReportsIt)
-{
-    Build(wxLC_SINGLE_SEL, 5);
-    Click(1);
-    m_events->Take();
-    const int lh = m_rows->GetLineHeight();
-    SendMouse(m_rows, wxEVT_RIGHT_DOWN, 50, 3 * lh + lh / 2);
-    EXPECT_EQ(m_events->Take(), (Events{Deselected(1), Focused(3), Selected(3),
-                                        EventRecord{wxEVT_LIST_ITEM_RIGHT_CLICK, 3, -1}}));
-}
-
-TEST_F(ListInput, ItemsKeepTheirTextsImagesDataAndState)
-{
-    Build(wxLC_SINGLE_SEL, 0);
-    EXPECT_EQ(m_list->InsertItem(0, wxString(), 0), 0);
-    EXPECT_EQ(m_list->InsertItem(1, wxS("second")), 1);
-    EXPECT_EQ(m_list->InsertItem(99, wxS("appended")), 2) << "an index past the end appends";
-    EXPECT_TRUE(m_list->SetItem(0, 1, wxS("cell")));
-    EXPECT_FALSE(m_list->SetItem(7, 1, wxS("no such row")));
-    EXPECT_TRUE(m_list->SetItemData(0, 42));
-    m_list->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-
-    wxListItem info;
-    info.SetId(0);
-    info.SetColumn(1);
-    info.SetMask(wxLIST_MASK_TEXT | wxLIST_MASK_DATA | wxLIST_MASK_STATE | wxLIST_MASK_IMAGE);
-    info.SetStateMask(wxLIST_STATE_SELECTED);
-    ASSERT_TRUE(m_list->GetItem(info));
-    EXPECT_EQ(info.GetText(), wxS("cell"));
-    EXPECT_EQ(info.GetData(), 42u);
-    EXPECT_EQ(info.GetState(), wxLIST_STATE_SELECTED);
-    EXPECT_EQ(info.GetImage(), -1) << "column 1 has no image of its own";
-    info.SetColumn(0);
-    ASSERT_TRUE(m_list->GetItem(info));
-    EXPECT_EQ(info.GetImage(), 0);
-    EXPECT_EQ(m_list->GetItemData(0), 42u);
-    EXPECT_EQ(m_list->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED), 0);
-    EXPECT_EQ(m_list->GetSelectedItemCount(), 1);
-    EXPECT_EQ(m_list->GetItemText(2), wxS("appended"));
-    info.SetId(3);
-    EXPECT_FALSE(m_list->GetItem(info)) << "no such row";
+    EXPECT_EQ(m_rows->GetScrollX(), 900 - client) << "no scrolling past the last column";
+    // Narrower and wider columns change the scrollbar's range.
+    for (const auto& [width, range] : {std::pair<int, int>{100, 700}, {500, 1100}})
+    {
+        m_list->SetColumnWidth(2, width);
+        m_rows->LayoutIfNeeded();
+        EXPECT_EQ(m_rows->GetScrollRange(wxHORIZONTAL), range);
+        EXPECT_LE(m_rows->GetScrollX(), range - client);
+    }
 }
 } // namespace

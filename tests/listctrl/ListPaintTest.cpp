@@ -1,10 +1,15 @@
-// What the rows window and the header paint, checked pixel by pixel.
+// What the rows window and the header paint, checked at known pixels.
 #include "ListTestSupport.h"
 
 #include "components/Utility/ProfilesKelvoListCellPainter.h"
 #include "platform/ui/DrawTextTruncate.h"
 
+#include "GuiTest.h"
+#include "PixelCompare.h"
+
 #include <wx/imaglist.h>
+
+#include <dlfcn.h>
 
 using namespace listtest;
 
@@ -13,32 +18,12 @@ namespace
 const wxString kBlock = wxString::FromUTF8("\xE2\x96\x88\xE2\x96\x88\xE2\x96\x88"); // three full blocks
 const wxColour kRed(220, 0, 0);
 
-class ListPaint : public ListFixture
-{
-protected:
-    ProfilesKelvoProfilesListCtrl* MakeRows(long extraStyle, const std::vector<int>& widths, long items,
-                                            const wxString& text = wxString())
-    {
-        auto* list = MakeList(wxLC_REPORT | extraStyle);
-        for (size_t col = 0; col < widths.size(); ++col)
-            list->InsertColumn(static_cast<long>(col), wxString::Format("C%zu", col), wxLIST_FORMAT_LEFT,
-                               widths[col]);
-        for (long item = 0; item < items; ++item)
-            list->InsertItem(item, text);
-        list->GetMainWindow()->LayoutIfNeeded();
-        return list;
-    }
+using ListPaint = ListFixture;
 
-    int LineHeight(ProfilesKelvoProfilesListCtrl* list) const
-    {
-        return list->GetMainWindow()->GetLineHeight();
-    }
-};
-
-TEST_F(ListPaint, VerticalRulesStandTwoPixelsLeftOfEveryColumnEdge)
+TEST_F(ListPaint, RulesSeparateRowsAndColumnsAndCloseTheLastItem)
 {
-    auto* list = MakeRows(wxLC_VRULES, {100, 80, 60}, 3);
-    const int lh = LineHeight(list);
+    auto* list = MakeRows(wxLC_HRULES | wxLC_VRULES, {100, 80, 60}, 3);
+    const int lh = list->GetMainWindow()->GetLineHeight();
     const wxImage image = RenderRows(list);
     const wxColour line = ListTheme().lineColour;
     for (int edge : {100, 180, 240})
@@ -50,17 +35,9 @@ TEST_F(ListPaint, VerticalRulesStandTwoPixelsLeftOfEveryColumnEdge)
             EXPECT_EQ(PixelAt(image, edge - 1, y), *wxWHITE) << "edge " << edge << " row " << row;
             EXPECT_EQ(PixelAt(image, edge - 3, y), *wxWHITE) << "edge " << edge << " row " << row;
         }
-        EXPECT_EQ(PixelAt(image, edge - 2, 0), line) << "rules reach the top of the first visible row";
-        EXPECT_EQ(PixelAt(image, edge - 2, 3 * lh + 2), *wxWHITE) << "rules end with the last row";
+        EXPECT_EQ(PixelAt(image, edge - 2, 0), line) << "from the top of the first visible row";
+        EXPECT_EQ(PixelAt(image, edge - 2, 3 * lh + 2), *wxWHITE) << "to the end of the last row";
     }
-}
-
-TEST_F(ListPaint, HorizontalRulesSeparateRowsAndCloseTheLastItem)
-{
-    auto* list = MakeRows(wxLC_HRULES, {100, 80}, 3);
-    const int lh = LineHeight(list);
-    const wxImage image = RenderRows(list);
-    const wxColour line = ListTheme().lineColour;
     EXPECT_EQ(PixelAt(image, 50, 0), *wxWHITE) << "no line above the first visible row";
     for (int y : {lh, 2 * lh, 3 * lh})
     {
@@ -69,80 +46,44 @@ TEST_F(ListPaint, HorizontalRulesSeparateRowsAndCloseTheLastItem)
     }
     EXPECT_EQ(PixelAt(image, 50, 3 * lh + 1), *wxWHITE);
     EXPECT_EQ(PixelAt(image, 50, 4 * lh), *wxWHITE) << "nothing below the last item";
-}
 
-TEST_F(ListPaint, SingleRowHasOnlyTheLineUnderIt)
-{
-    auto* list = MakeRows(wxLC_HRULES, {100}, 1);
-    const int lh = LineHeight(list);
-    const wxImage image = RenderRows(list);
-    const wxColour line = ListTheme().lineColour;
-    EXPECT_EQ(CountPixels(image, wxRect(50, 0, 1, lh), line), 0);
-    EXPECT_EQ(PixelAt(image, 50, lh), line);
-}
-
-TEST_F(ListPaint, ScrolledListHasNoLineAboveItsFirstVisibleRowNorUnderARowThatIsNotLast)
-{
-    auto* list = MakeRows(wxLC_HRULES, {100}, 200);
+    // Scrolled: no line above the first visible row, none under a row that is not the last.
+    m_frame->Destroy();
+    list = MakeRows(wxLC_HRULES, {100}, 200);
     ProfilesKelvoListMainWindow* rows = list->GetMainWindow();
     rows->ScrollToTop(10);
-    ASSERT_EQ(rows->GetTopItem(), 10);
-    const int lh = LineHeight(list);
-    const wxImage image = RenderRows(list);
-    const wxColour line = ListTheme().lineColour;
-    EXPECT_EQ(PixelAt(image, 50, 0), *wxWHITE);
-    EXPECT_EQ(PixelAt(image, 50, lh), line);
-    const long lastVisible = rows->GetLastVisibleItem();
-    ASSERT_LT(lastVisible, 199);
-    const int underLast = static_cast<int>((lastVisible - 10 + 1) * lh);
-    if (underLast < image.GetHeight())
-    {
-        EXPECT_EQ(PixelAt(image, 50, underLast), *wxWHITE);
-    }
+    const wxImage scrolled = RenderRows(list);
+    EXPECT_EQ(PixelAt(scrolled, 50, 0), *wxWHITE);
+    EXPECT_EQ(PixelAt(scrolled, 50, lh), line);
+    const int underLast = static_cast<int>((rows->GetLastVisibleItem() - 10 + 1) * lh);
+    if (underLast < scrolled.GetHeight())
+        EXPECT_EQ(PixelAt(scrolled, 50, underLast), *wxWHITE);
 }
 
-TEST_F(ListPaint, OddRowsTakeTheAlternateColour)
+TEST_F(ListPaint, RowFillsAndTextFollowAlternationSelectionAndFocus)
 {
-    auto* list = MakeRows(0, {100, 80}, 4);
+    auto* list = MakeRows(0, {100, 80}, 4, kBlock);
     const wxColour alternate(200, 230, 200);
     list->SetAlternateRowColour(alternate);
-    const int lh = LineHeight(list);
-    const wxImage image = RenderRows(list);
-    for (int row = 0; row < 4; ++row)
-        EXPECT_EQ(PixelAt(image, 150, row * lh + lh / 2), row % 2 ? alternate : *wxWHITE) << "row " << row;
-    EXPECT_EQ(PixelAt(image, 300, lh + lh / 2), *wxWHITE) << "only under the columns";
-}
-
-TEST_F(ListPaint, SelectionFillFollowsTheFocusOfTheRows)
-{
-    auto* list = MakeRows(0, {100, 80}, 3);
-    list->SetAlternateRowColour(wxColour(200, 230, 200));
     list->SetItemState(1, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-    const int lh = LineHeight(list);
-    ProfilesKelvoListMainWindow* rows = list->GetMainWindow();
+    const int lh = list->GetMainWindow()->GetLineHeight();
+    const auto fill = [&](const wxImage& image, int row) { return PixelAt(image, 150, row * lh + lh / 2); };
 
-    SendFocus(rows, false);
-    EXPECT_EQ(PixelAt(RenderRows(list), 150, lh + lh / 2), ListTheme().inactiveSelectionColour);
-    SendFocus(rows, true);
+    SendFocus(list->GetMainWindow(), true);
     wxImage image = RenderRows(list);
-    EXPECT_EQ(PixelAt(image, 150, lh + lh / 2), ListTheme().selectionColour);
-    EXPECT_EQ(PixelAt(image, 150, lh / 2), *wxWHITE) << "unselected rows keep their fill";
-    SendFocus(rows, false);
-    EXPECT_EQ(PixelAt(RenderRows(list), 150, lh + lh / 2), ListTheme().inactiveSelectionColour);
-}
-
-TEST_F(ListPaint, SelectedRowsUseTheSelectedTextColour)
-{
-    auto* list = MakeRows(0, {100, 80}, 2, kBlock);
-    list->SetItemState(1, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-    const int lh = LineHeight(list);
-    const wxImage image = RenderRows(list);
+    EXPECT_EQ(fill(image, 0), *wxWHITE);
+    EXPECT_EQ(fill(image, 1), ListTheme().selectionColour);
+    EXPECT_EQ(fill(image, 2), *wxWHITE);
+    EXPECT_EQ(fill(image, 3), alternate);
+    EXPECT_EQ(PixelAt(image, 300, 3 * lh + lh / 2), *wxWHITE) << "only under the columns";
     const wxRect first(0, 0, 100, lh);
     const wxRect second(0, lh, 100, lh);
     EXPECT_GT(CountPixels(image, first, ListTheme().textColour), 10);
     EXPECT_EQ(CountPixels(image, first, ListTheme().selectedTextColour), 0);
     EXPECT_GT(CountPixels(image, second, ListTheme().selectedTextColour), 10);
     EXPECT_EQ(CountPixels(image, second, ListTheme().textColour), 0);
+    SendFocus(list->GetMainWindow(), false);
+    EXPECT_EQ(fill(RenderRows(list), 1), ListTheme().inactiveSelectionColour);
 }
 
 TEST_F(ListPaint, StatusMarksTakeTheItemColourWhileTheTextKeepsTheTheme)
@@ -152,7 +93,7 @@ TEST_F(ListPaint, StatusMarksTakeTheItemColourWhileTheTextKeepsTheTheme)
     list->SetItem(1, 0, kBlock, kCellImageStatusSquare);
     list->SetItemTextColour(0, kRed);
     list->SetItemTextColour(1, kRed);
-    const int lh = LineHeight(list);
+    const int lh = list->GetMainWindow()->GetLineHeight();
     const wxImage image = RenderRows(list);
 
     EXPECT_EQ(PixelAt(image, 1 + 12, 12), kRed) << "circle centre";
@@ -160,20 +101,17 @@ TEST_F(ListPaint, StatusMarksTakeTheItemColourWhileTheTextKeepsTheTheme)
     EXPECT_EQ(PixelAt(image, 1 + 12, 12 + 11), *wxWHITE) << "outside the radius";
     EXPECT_EQ(PixelAt(image, 1 + 3 + 8, lh + 4 + 8), kRed) << "square centre";
     EXPECT_LT(PixelAt(image, 1 + 3, lh + 4 + 8).Red(), 80) << "square outlined in black";
-
-    // The text stands right of the mark, in the theme's colour, never in red.
     for (int row = 0; row < 2; ++row)
     {
         const wxRect text(1 + 24, row * lh, 90, lh);
         EXPECT_GT(CountPixels(image, text, ListTheme().textColour), 10) << "row " << row;
         EXPECT_EQ(CountPixels(image, text, kRed), 0) << "row " << row;
     }
-
     wxListItem info;
     info.SetId(0);
     info.SetMask(wxLIST_MASK_TEXT);
     ASSERT_TRUE(list->GetItem(info));
-    EXPECT_EQ(info.GetTextColour(), ListTheme().textColour);
+    EXPECT_EQ(info.GetTextColour(), ListTheme().textColour) << "reported as drawn";
 }
 
 struct ProgressCase
@@ -182,7 +120,7 @@ struct ProgressCase
     int filled; // of the 96 inner pixels of a 108-pixel column
 };
 
-class ListProgress : public ListPaint, public ::testing::WithParamInterface<ProgressCase>
+class ListProgress : public ListFixture, public ::testing::WithParamInterface<ProgressCase>
 {
 };
 
@@ -193,130 +131,80 @@ TEST_P(ListProgress, FillsTheFrameInProportionAndShowsNoText)
     list->InsertColumn(1, wxS("Name"), wxLIST_FORMAT_LEFT, 100);
     list->InsertItem(0, wxString::FromUTF8(GetParam().text));
     list->SetItem(0, 1, wxS("x"));
-    const int lh = LineHeight(list);
+    const int lh = list->GetMainWindow()->GetLineHeight();
     const wxImage image = RenderRows(list);
     EXPECT_EQ(CountPixels(image, wxRect(0, lh / 2, 108, 1), *wxBLUE), GetParam().filled);
     if (GetParam().filled > 0)
-    {
         EXPECT_EQ(PixelAt(image, 3, lh / 2), *wxBLUE) << "the bar starts inside the frame";
-    }
     EXPECT_EQ(CountPixels(image, wxRect(0, 0, 108, lh), ListTheme().textColour), 0);
 }
 
-INSTANTIATE_TEST_SUITE_P(Percentages, ListProgress,
+INSTANTIATE_TEST_SUITE_P(ListPercentages, ListProgress,
                          ::testing::Values(ProgressCase{"0", 0}, ProgressCase{"50", 48},
                                            ProgressCase{"100", 96}, ProgressCase{"not a number", 0},
                                            ProgressCase{"25.5", 24}, ProgressCase{"250", 96},
                                            ProgressCase{"-40", 0}));
 
-// The reference: the same text drawn straight, or shortened, at the cell's place.
-wxImage ReferenceCell(ProfilesKelvoProfilesListCtrl* list, const wxString& text, int width, bool shortened)
-{
-    ProfilesKelvoListMainWindow* rows = list->GetMainWindow();
-    const wxSize size = rows->GetClientSize();
-    wxBitmap bitmap(size);
-    {
-        wxMemoryDC dc(bitmap);
-        dc.SetBackground(*wxWHITE_BRUSH);
-        dc.Clear();
-        dc.SetFont(rows->GetFont());
-        dc.SetTextForeground(ListTheme().textColour);
-        dc.SetBackgroundMode(wxBRUSHSTYLE_TRANSPARENT);
-        const wxSize extent = dc.GetTextExtent(text);
-        const int y = rows->GetLineHeight() / 2 - (extent.GetHeight() + 1) / 2;
-        if (shortened)
-            DrawTextTruncate(dc, text, wxRect(1, y, width, extent.GetHeight()), 0, false);
-        else
-            dc.DrawText(text, 1, y);
-    }
-    return bitmap.ConvertToImage();
-}
-
-bool SameCell(const wxImage& a, const wxImage& b, int width, int height)
-{
-    for (int y = 0; y < height; ++y)
-        for (int x = 0; x < width; ++x)
-            if (PixelAt(a, x, y) != PixelAt(b, x, y))
-                return false;
-    return true;
-}
-
+// A cell shortens its text exactly when the text is wider than the column less
+// eight pixels, and then shows what DrawTextTruncate draws at the cell's place.
 TEST_F(ListPaint, TextIsShortenedExactlyWhenWiderThanTheColumnLessEight)
 {
     const wxString text = wxS("Transferring to server");
     for (int spare : {0, -1})
     {
         auto* list = MakeList(wxLC_REPORT);
-        int textWidth = 0;
-        {
-            wxBitmap probe(1, 1);
-            wxMemoryDC dc(probe);
-            dc.SetFont(list->GetMainWindow()->GetFont());
-            textWidth = dc.GetTextExtent(text).GetWidth();
-        }
+        ProfilesKelvoListMainWindow* rows = list->GetMainWindow();
+        const int textWidth = rows->GetTextExtent(text).GetWidth();
         const int columnWidth = textWidth + 8 + spare;
         list->InsertColumn(0, wxS("Status"), wxLIST_FORMAT_LEFT, columnWidth);
         list->InsertItem(0, text);
-        const wxImage image = RenderRows(list);
-        const int lh = list->GetMainWindow()->GetLineHeight();
-        const bool shortened = spare < 0;
-        const wxImage whole = ReferenceCell(list, text, textWidth, false);
-        const wxImage cut = ReferenceCell(list, text, textWidth - 1, true);
-        EXPECT_TRUE(SameCell(image, shortened ? cut : whole, columnWidth, lh)) << "spare " << spare;
-        EXPECT_FALSE(SameCell(image, shortened ? whole : cut, columnWidth, lh)) << "spare " << spare;
+        const wxRect cell(0, 0, columnWidth, rows->GetLineHeight());
+        const wxImage shown = RenderRows(list).GetSubImage(cell);
+        const auto reference = [&](bool shortened)
+        {
+            return pixels::Render(cell.GetSize(), *wxWHITE,
+                                  [&](wxDC& dc)
+                                  {
+                                      dc.SetFont(rows->GetFont());
+                                      dc.SetTextForeground(ListTheme().textColour);
+                                      const wxSize extent = dc.GetTextExtent(text);
+                                      const int y = rows->GetLineHeight() / 2 - (extent.GetHeight() + 1) / 2;
+                                      if (shortened)
+                                          DrawTextTruncate(dc, text, wxRect(1, y, textWidth - 1, extent.y), 0,
+                                                           false);
+                                      else
+                                          dc.DrawText(text, 1, y);
+                                  });
+        };
+        EXPECT_EQ(pixels::FirstDifference(shown, reference(spare < 0)), "") << "spare " << spare;
+        EXPECT_NE(pixels::FirstDifference(shown, reference(spare >= 0)), "") << "spare " << spare;
         m_frame->Destroy();
         m_frame = nullptr;
     }
 }
 
-TEST(DrawTextTruncate, ShortensWithAnEllipsisWithinTheWidth)
-{
-    wxBitmap probe(1, 1);
-    wxMemoryDC dc(probe);
-    dc.SetFont(*wxNORMAL_FONT);
-    const wxString text = wxS("A rather long file name.pdf");
-    const int full = dc.GetTextExtent(text).GetWidth();
-    EXPECT_EQ(TruncateTextToWidth(dc, text, full, false), text);
-    for (int width : {full - 1, full / 2, 30})
-    {
-        const wxString shown = TruncateTextToWidth(dc, text, width, false);
-        EXPECT_TRUE(shown.EndsWith(wxS("..."))) << width;
-        EXPECT_LE(dc.GetTextExtent(shown).GetWidth(), width) << width;
-        EXPECT_TRUE(text.StartsWith(shown.Left(shown.length() - 3).Trim())) << width;
-    }
-    EXPECT_EQ(TruncateTextToWidth(dc, text, 2, true), wxString()) << "an image cell shows no lone ellipsis";
-    EXPECT_EQ(TruncateTextToWidth(dc, text, 2, false), wxS("..."));
-}
-
 // ---------------------------------------------------------------- header
-
-wxImageList* MakeSolidImages(const wxColour& colour)
-{
-    auto* images = new wxImageList(16, 16, true, 1);
-    wxImage solid(16, 16);
-    solid.SetRGB(wxRect(0, 0, 16, 16), colour.Red(), colour.Green(), colour.Blue());
-    images->Add(wxBitmap(solid));
-    return images;
-}
 
 TEST_F(ListPaint, StyledHeaderIsFlatWithBordersLabelsAndSortMarks)
 {
     headerStyle style;
     style.backgroundColour = *wxWHITE;
-    wxImage strip(1, 23);
-    style.bitmap = wxBitmap(strip);
+    style.bitmap = wxBitmap(wxImage(1, 23));
     style.textColour = kRed;
     auto* list = MakeList(wxLC_REPORT, &style);
-    std::unique_ptr<wxImageList> marks(MakeSolidImages(wxColour(0, 160, 0)));
-    list->SetImageList(marks.get(), kHeaderImageList);
+    const wxColour green(0, 160, 0);
+    wxImageList marks(16, 16, true, 1);
+    wxImage solid(16, 16);
+    solid.SetRGB(wxRect(0, 0, 16, 16), green.Red(), green.Green(), green.Blue());
+    marks.Add(wxBitmap(solid));
+    list->SetImageList(&marks, kHeaderImageList);
     list->InsertColumn(0, kBlock, wxLIST_FORMAT_LEFT, 100);
     list->InsertColumn(1, kBlock, wxLIST_FORMAT_LEFT, 120);
     wxListItem mark;
     mark.SetImage(0);
     list->SetColumn(1, mark);
 
-    ProfilesKelvoListHeaderWindow* header = list->GetHeaderWindow();
-    ASSERT_EQ(header->GetSize().GetHeight(), 25);
+    ASSERT_EQ(list->GetHeaderWindow()->GetSize().GetHeight(), 25);
     const wxImage image = RenderHeader(list);
     const wxColour border = Themer::GetThemeService()->GetTheme("HeaderView").lineColour;
     EXPECT_EQ(PixelAt(image, 100 - 1, 12), border) << "right edge less the strip's width";
@@ -324,20 +212,48 @@ TEST_F(ListPaint, StyledHeaderIsFlatWithBordersLabelsAndSortMarks)
     EXPECT_EQ(PixelAt(image, 400, 0), border) << "outline";
     EXPECT_EQ(PixelAt(image, 400, 12), ListTheme().controlColour);
     EXPECT_GT(CountPixels(image, wxRect(0, 0, 99, 25), kRed), 10) << "label in the record's text colour";
-    const wxColour green(0, 160, 0);
     EXPECT_EQ(CountPixels(image, wxRect(0, 0, 99, 25), green), 0);
-    const int sortMarkPixels = CountPixels(image, wxRect(100, 0, 119, 25), green);
-    EXPECT_EQ(sortMarkPixels, 16 * 16);
+    EXPECT_EQ(CountPixels(image, wxRect(100, 0, 119, 25), green), 16 * 16) << "the sort mark";
     list->SetImageList(nullptr, kHeaderImageList);
 }
 
 TEST_F(ListPaint, PlainHeaderIsAsHighAsItsTextWithRoom)
 {
-    auto* list = MakeList(wxLC_REPORT);
-    ProfilesKelvoListHeaderWindow* header = list->GetHeaderWindow();
+    ProfilesKelvoListHeaderWindow* header = MakeList(wxLC_REPORT)->GetHeaderWindow();
     int height = 0;
     int descent = 0;
     header->GetTextExtent(wxS("Hg"), nullptr, &height, &descent);
     EXPECT_EQ(header->GetSize().GetHeight(), height + descent + 6);
+}
+
+// Whether the window asked the toolkit to repaint it since the last call; the request is taken.
+bool TakeRepaintRequest(wxWindow* window)
+{
+    // Looked up at run time, so that the test needs no GTK headers.
+    static const auto windowOf =
+        reinterpret_cast<void* (*)(void*)>(dlsym(RTLD_DEFAULT, "gtk_widget_get_window"));
+    static const auto area =
+        reinterpret_cast<void* (*)(void*)>(dlsym(RTLD_DEFAULT, "gdk_window_get_update_area"));
+    static const auto release =
+        reinterpret_cast<void (*)(void*)>(dlsym(RTLD_DEFAULT, "cairo_region_destroy"));
+    void* requested = area(windowOf(window->GetHandle()));
+    if (requested)
+        release(requested);
+    return requested != nullptr;
+}
+
+TEST_F(ListPaint, HeaderIsRepaintedForANewTitleOrWidth)
+{
+    auto* list = MakeRows(0, {100, 100}, 1);
+    ASSERT_TRUE(guitest::PumpUntil([list] { return !list->GetMainWindow()->IsDirty(); }));
+    ProfilesKelvoListHeaderWindow* header = list->GetHeaderWindow();
+    TakeRepaintRequest(header);
+    ASSERT_FALSE(TakeRepaintRequest(header));
+    wxListItem title;
+    title.SetText(kBlock);
+    list->SetColumn(0, title);
+    EXPECT_TRUE(TakeRepaintRequest(header)) << "title";
+    list->SetColumnWidth(0, 160);
+    EXPECT_TRUE(TakeRepaintRequest(header)) << "width";
 }
 } // namespace

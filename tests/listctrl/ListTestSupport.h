@@ -9,6 +9,8 @@
 #include <wx/frame.h>
 #include <wx/image.h>
 
+#include <string>
+#include <utility>
 #include <vector>
 
 namespace listtest
@@ -38,23 +40,20 @@ inline wxImage RenderRows(ProfilesKelvoProfilesListCtrl* list)
 {
     ProfilesKelvoListMainWindow* rows = list->GetMainWindow();
     rows->LayoutIfNeeded();
-    const wxSize size = rows->GetClientSize();
-    wxBitmap bitmap(size);
+    wxBitmap bitmap(rows->GetClientSize());
     {
         wxMemoryDC dc(bitmap);
-        rows->Render(dc, wxRect(size));
+        rows->Render(dc, wxRect(rows->GetClientSize()));
     }
     return bitmap.ConvertToImage();
 }
 
 inline wxImage RenderHeader(ProfilesKelvoProfilesListCtrl* list)
 {
-    ProfilesKelvoListHeaderWindow* header = list->GetHeaderWindow();
-    const wxSize size = header->GetClientSize();
-    wxBitmap bitmap(size);
+    wxBitmap bitmap(list->GetHeaderWindow()->GetClientSize());
     {
         wxMemoryDC dc(bitmap);
-        header->Render(dc);
+        list->GetHeaderWindow()->Render(dc);
     }
     return bitmap.ConvertToImage();
 }
@@ -81,87 +80,54 @@ protected:
         return list;
     }
 
+    // A list of report style with columns of the given widths and `items` rows of `text`.
+    ProfilesKelvoProfilesListCtrl* MakeRows(long style, const std::vector<int>& widths, long items,
+                                            const wxString& text = wxString())
+    {
+        auto* list = MakeList(wxLC_REPORT | style);
+        for (size_t col = 0; col < widths.size(); ++col)
+            list->InsertColumn(static_cast<long>(col), wxString::Format("C%zu", col), wxLIST_FORMAT_LEFT,
+                               widths[col]);
+        if (style & wxLC_VIRTUAL)
+            list->SetItemCount(items);
+        for (long item = 0; item < items && !(style & wxLC_VIRTUAL); ++item)
+            list->InsertItem(item, text.empty() ? wxString::Format("row %ld", item) : text);
+        list->GetMainWindow()->LayoutIfNeeded();
+        return list;
+    }
+
     wxFrame* m_frame = nullptr;
 };
 
-// Every list event the control sends, in order.
-struct EventRecord
-{
-    wxEventType type;
-    long index;
-    int column;
-
-    bool operator==(const EventRecord& other) const
-    {
-        return type == other.type && index == other.index && column == other.column;
-    }
-};
-
-inline std::ostream& operator<<(std::ostream& out, const EventRecord& record)
-{
-    return out << "{type " << record.type << ", index " << record.index << ", column " << record.column
-               << "}";
-}
-
+// The list events in order, a word each: S, D, F, A, K, R and the item for
+// selected, deselected, focused, activated, key down and right click; C, X, B,
+// G, E and the column for column click, right click, drag begin, dragging, end.
 class EventLog
 {
 public:
     explicit EventLog(wxWindow* list)
     {
-        for (wxEventType type :
-             {wxEVT_LIST_ITEM_SELECTED, wxEVT_LIST_ITEM_DESELECTED, wxEVT_LIST_ITEM_ACTIVATED,
-              wxEVT_LIST_ITEM_FOCUSED, wxEVT_LIST_COL_CLICK, wxEVT_LIST_COL_RIGHT_CLICK,
-              wxEVT_LIST_COL_BEGIN_DRAG, wxEVT_LIST_COL_DRAGGING, wxEVT_LIST_COL_END_DRAG,
-              wxEVT_LIST_KEY_DOWN, wxEVT_LIST_CACHE_HINT, wxEVT_LIST_ITEM_RIGHT_CLICK})
-        {
-            list->Bind(wxEventTypeTag<wxListEvent>(type),
-                       [this](wxListEvent& event)
+        const wxEventType types[] = {
+            wxEVT_LIST_ITEM_SELECTED,  wxEVT_LIST_ITEM_DESELECTED, wxEVT_LIST_ITEM_FOCUSED,
+            wxEVT_LIST_ITEM_ACTIVATED, wxEVT_LIST_KEY_DOWN,        wxEVT_LIST_ITEM_RIGHT_CLICK,
+            wxEVT_LIST_COL_CLICK,      wxEVT_LIST_COL_RIGHT_CLICK, wxEVT_LIST_COL_BEGIN_DRAG,
+            wxEVT_LIST_COL_DRAGGING,   wxEVT_LIST_COL_END_DRAG};
+        for (int kind = 0; kind < 11; ++kind)
+            list->Bind(wxEventTypeTag<wxListEvent>(types[kind]),
+                       [this, kind](wxListEvent& event)
                        {
-                           const bool column = event.GetEventType() == wxEVT_LIST_COL_CLICK ||
-                                               event.GetEventType() == wxEVT_LIST_COL_RIGHT_CLICK ||
-                                               event.GetEventType() == wxEVT_LIST_COL_BEGIN_DRAG ||
-                                               event.GetEventType() == wxEVT_LIST_COL_DRAGGING ||
-                                               event.GetEventType() == wxEVT_LIST_COL_END_DRAG;
-                           records.push_back({event.GetEventType(), column ? -1 : event.GetIndex(),
-                                              column ? event.GetColumn() : -1});
-                           if (event.GetEventType() == wxEVT_LIST_KEY_DOWN)
-                               lastKeyCode = event.GetKeyCode();
+                           text += (text.empty() ? "" : " ") + std::string(1, "SDFAKRCXBGE"[kind]) +
+                                   std::to_string(kind >= 6 ? event.GetColumn() : event.GetIndex());
+                           lastKeyCode = kind == 4 ? event.GetKeyCode() : lastKeyCode;
                            event.Skip();
                        });
-        }
     }
 
-    std::vector<EventRecord> Take()
-    {
-        std::vector<EventRecord> taken;
-        taken.swap(records);
-        return taken;
-    }
+    std::string Take() { return std::exchange(text, std::string()); }
 
-    std::vector<EventRecord> records;
+    std::string text;
     int lastKeyCode = 0;
 };
-
-inline EventRecord Selected(long item)
-{
-    return {wxEVT_LIST_ITEM_SELECTED, item, -1};
-}
-inline EventRecord Deselected(long item)
-{
-    return {wxEVT_LIST_ITEM_DESELECTED, item, -1};
-}
-inline EventRecord Focused(long item)
-{
-    return {wxEVT_LIST_ITEM_FOCUSED, item, -1};
-}
-inline EventRecord Activated(long item)
-{
-    return {wxEVT_LIST_ITEM_ACTIVATED, item, -1};
-}
-inline EventRecord KeyDown(long item)
-{
-    return {wxEVT_LIST_KEY_DOWN, item, -1};
-}
 
 // Events delivered straight to a window's handler, as the toolkit would.
 inline void SendMouse(wxWindow* window, wxEventType type, int x, int y, bool ctrl = false, bool shift = false,

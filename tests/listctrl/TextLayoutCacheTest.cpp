@@ -1,164 +1,127 @@
-// Texts drawn from kept layouts must look exactly as wxDC::DrawText draws them.
+// Texts drawn from kept layouts, and shortened texts, must look exactly as
+// wxDC::DrawText draws them.
 #include "platform/ui/TextLayoutCache.h"
 #include "platform/ui/DrawTextTruncate.h"
 
 #include "PixelCompare.h"
 
 #include <gtest/gtest.h>
+#include <wx/dcmemory.h>
 
 #include <functional>
 
 namespace
 {
+using Paint = std::function<void(wxDC&)>;
 
-const wxSize kCanvas(320, 40);
-
-wxImage Paint(const std::function<void(wxDC&)>& paint)
+// The same set-up drawn once by `draw` and once by wxDC::DrawText: the first difference, or "".
+std::string Compare(const Paint& setUp, const std::function<void(wxDC&, int, int)>& draw,
+                    const wxString& text)
 {
-    return pixels::Render(kCanvas, *wxWHITE, paint);
+    const auto render = [&](const Paint& paint) { return pixels::Render(wxSize(320, 40), *wxWHITE, paint); };
+    const wxImage expected = render([&](wxDC& dc) { setUp(dc), dc.DrawText(text, 7, 9); });
+    EXPECT_TRUE(pixels::AnyPixelDiffersIn(expected, 0, 320, *wxWHITE)) << "nothing drawn: " << text;
+    return pixels::FirstDifference(render([&](wxDC& dc) { setUp(dc), draw(dc, 7, 9); }), expected);
 }
 
-using pixels::FirstDifference;
-
-struct Style
+Paint Style(const wxFont& font, const wxColour& colour)
 {
-    wxFont font;
-    wxColour colour;
-};
-
-void Apply(wxDC& dc, const Style& style)
-{
-    dc.SetFont(style.font);
-    dc.SetTextForeground(style.colour);
-    dc.SetBackgroundMode(wxBRUSHSTYLE_TRANSPARENT);
+    return [font, colour](wxDC& dc)
+    {
+        dc.SetFont(font);
+        dc.SetTextForeground(colour);
+        dc.SetBackgroundMode(wxBRUSHSTYLE_TRANSPARENT);
+    };
 }
 
 const wxString kTexts[] = {wxS("Transferring to server"),
                            wxString::FromUTF8("M\xC3\xBCnchen \xE2\x80\x93 caf\xC3\xA9"), wxS("12,345 KB"),
                            wxString::FromUTF8("\xE5\x8D\xB0\xE5\x88\xB7 job.pdf")};
 
-} // namespace
-
-TEST(TextLayoutCache, DrawsWhatDrawTextDrawsFromTheFirstAndTheKeptLayout)
+TEST(ListTextLayout, DrawsWhatDrawTextDrawsFromTheFirstAndTheKeptLayout)
 {
-    const Style styles[] = {{*wxNORMAL_FONT, wxColour(20, 20, 20)},
-                            {wxFont(*wxNORMAL_FONT).Bold(), wxColour(0, 90, 200)},
-                            {wxFont(wxFontInfo(15).Family(wxFONTFAMILY_SWISS)), wxColour(200, 0, 0)}};
     TextLayoutCache cache;
-    for (const Style& style : styles)
+    for (const Paint& style : {Style(*wxNORMAL_FONT, wxColour(20, 20, 20)),
+                               Style(wxFont(*wxNORMAL_FONT).Bold(), wxColour(0, 90, 200)),
+                               Style(wxFont(wxFontInfo(15).Family(wxFONTFAMILY_SWISS)), wxColour(200, 0, 0))})
         for (const wxString& text : kTexts)
-        {
-            const wxImage expected = Paint(
-                [&](wxDC& dc)
-                {
-                    Apply(dc, style);
-                    dc.DrawText(text, 7, 9);
-                });
-            ASSERT_TRUE(pixels::AnyPixelDiffersIn(expected, 0, kCanvas.GetWidth(), *wxWHITE)) << text;
             for (int round = 0; round < 2; ++round)
-            {
-                const wxImage actual = Paint(
-                    [&](wxDC& dc)
-                    {
-                        Apply(dc, style);
-                        cache.DrawText(dc, text, 7, 9);
-                    });
-                EXPECT_EQ(FirstDifference(actual, expected), "") << text << ", round " << round;
-            }
-        }
+                EXPECT_EQ(Compare(
+                              style, [&](wxDC& dc, int x, int y) { cache.DrawText(dc, text, x, y); }, text),
+                          "")
+                    << text << ", round " << round;
 }
 
-TEST(TextLayoutCache, ForgetsItsLayoutsWhenTheFontChanges)
+TEST(ListTextLayout, KeepsItsLayoutsForAnEqualFontAndForgetsThemForAnother)
 {
     TextLayoutCache cache;
-    const Style normal{*wxNORMAL_FONT, *wxBLACK};
-    const Style bold{wxFont(*wxNORMAL_FONT).Bold(), *wxBLACK};
-    Paint(
-        [&](wxDC& dc)
-        {
-            Apply(dc, normal);
-            for (const wxString& text : kTexts)
-                cache.DrawText(dc, text, 0, 0);
-        });
-    EXPECT_EQ(cache.Size(), std::size(kTexts));
-
-    // An equal font in another object keeps them; another weight does not.
-    Paint(
-        [&](wxDC& dc)
-        {
-            Apply(dc, Style{wxFont(*wxNORMAL_FONT), *wxBLACK});
-            cache.DrawText(dc, kTexts[0], 0, 0);
-        });
-    EXPECT_EQ(cache.Size(), std::size(kTexts));
-    const wxImage actual = Paint(
-        [&](wxDC& dc)
-        {
-            Apply(dc, bold);
-            cache.DrawText(dc, kTexts[0], 4, 4);
-        });
-    EXPECT_EQ(cache.Size(), 1u);
-    const wxImage expected = Paint(
-        [&](wxDC& dc)
-        {
-            Apply(dc, bold);
-            dc.DrawText(kTexts[0], 4, 4);
-        });
-    EXPECT_EQ(FirstDifference(actual, expected), "");
-}
-
-TEST(TextLayoutCache, LeavesWhatItCannotDrawAloneToDrawText)
-{
-    TextLayoutCache cache;
-    const Style underlined{wxFont(*wxNORMAL_FONT).Underlined(), *wxBLACK};
-    auto drawBoth = [&](const std::function<void(wxDC&)>& setUp, const wxString& text)
+    const auto drawFirst = [&](const Paint& style)
     {
-        const wxImage actual = Paint(
-            [&](wxDC& dc)
-            {
-                setUp(dc);
-                cache.DrawText(dc, text, 3, 3);
-            });
-        const wxImage expected = Paint(
-            [&](wxDC& dc)
-            {
-                setUp(dc);
-                dc.DrawText(text, 3, 3);
-            });
-        EXPECT_EQ(FirstDifference(actual, expected), "") << text;
+        pixels::Render(wxSize(1, 1), *wxWHITE,
+                       [&](wxDC& dc) { style(dc), cache.DrawText(dc, kTexts[0], 0, 0); });
     };
-    drawBoth([&](wxDC& dc) { Apply(dc, underlined); }, wxS("underlined"));
-    drawBoth(
-        [&](wxDC& dc)
-        {
-            Apply(dc, Style{*wxNORMAL_FONT, *wxBLACK});
-            dc.SetBackgroundMode(wxBRUSHSTYLE_SOLID);
-            dc.SetTextBackground(wxColour(255, 255, 0));
-        },
-        wxS("on yellow"));
-    drawBoth([&](wxDC& dc) { Apply(dc, Style{*wxNORMAL_FONT, *wxBLACK}); }, wxS("two\nlines"));
+    for (const wxString& text : kTexts)
+        pixels::Render(wxSize(1, 1), *wxWHITE,
+                       [&](wxDC& dc)
+                       { Style(*wxNORMAL_FONT, *wxBLACK)(dc), cache.DrawText(dc, text, 0, 0); });
+    EXPECT_EQ(cache.Size(), std::size(kTexts));
+    drawFirst(Style(wxFont(*wxNORMAL_FONT), *wxBLACK));
+    EXPECT_EQ(cache.Size(), std::size(kTexts)) << "an equal font in another object";
+    const Paint bold = Style(wxFont(*wxNORMAL_FONT).Bold(), *wxBLACK);
+    EXPECT_EQ(Compare(
+                  bold, [&](wxDC& dc, int x, int y) { cache.DrawText(dc, kTexts[0], x, y); }, kTexts[0]),
+              "");
+    EXPECT_EQ(cache.Size(), 1u);
+}
+
+TEST(ListTextLayout, LeavesWhatItCannotDrawAloneToDrawText)
+{
+    TextLayoutCache cache;
+    const Paint plain = Style(*wxNORMAL_FONT, *wxBLACK);
+    const Paint onYellow = [&](wxDC& dc)
+    {
+        plain(dc);
+        dc.SetBackgroundMode(wxBRUSHSTYLE_SOLID);
+        dc.SetTextBackground(wxColour(255, 255, 0));
+    };
+    const std::pair<Paint, wxString> cases[] = {
+        {Style(wxFont(*wxNORMAL_FONT).Underlined(), *wxBLACK), wxS("underlined")},
+        {onYellow, wxS("on yellow")},
+        {plain, wxS("two\nlines")}};
+    for (const auto& [setUp, text] : cases)
+        EXPECT_EQ(Compare(
+                      setUp, [&](wxDC& dc, int x, int y) { cache.DrawText(dc, text, x, y); }, text),
+                  "")
+            << text;
     EXPECT_EQ(cache.Size(), 0u);
 }
 
-TEST(DrawTextTruncate, DrawsTheShortenedTextAsDrawTextWould)
+// What a cell too narrow for its text shows: the longest start that fits with an ellipsis.
+TEST(ListTruncate, ShortensWithAnEllipsisWithinTheWidthAndDrawsItAsDrawText)
 {
-    const wxString text = wxS("A rather long file name of a poster.pdf");
-    for (int round = 0; round < 2; ++round)
+    const Paint plain = Style(*wxNORMAL_FONT, *wxBLACK);
+    const wxString text = wxS("A rather long file name.pdf");
+    wxBitmap probe(1, 1);
+    wxMemoryDC dc(probe);
+    plain(dc);
+    const int full = dc.GetTextExtent(text).GetWidth();
+    EXPECT_EQ(TruncateTextToWidth(dc, text, full, false), text);
+    for (int width : {full - 1, full / 2, 30})
     {
-        wxString shown;
-        const wxImage actual = Paint(
-            [&](wxDC& dc)
-            {
-                Apply(dc, Style{*wxNORMAL_FONT, *wxBLACK});
-                shown = TruncateTextToWidth(dc, text, 120, false);
-                DrawTextTruncate(dc, text, wxRect(5, 5, 120, 20), 0, false);
-            });
-        const wxImage expected = Paint(
-            [&](wxDC& dc)
-            {
-                Apply(dc, Style{*wxNORMAL_FONT, *wxBLACK});
-                dc.DrawText(shown, 5, 5);
-            });
-        EXPECT_TRUE(shown.EndsWith(wxS("...")));
-        EXPECT_EQ(FirstDifference(actual, expected), "") << "round " << round;
+        const wxString shown = TruncateTextToWidth(dc, text, width, false);
+        EXPECT_TRUE(shown.EndsWith(wxS("..."))) << width;
+        EXPECT_LE(dc.GetTextExtent(shown).GetWidth(), width) << width;
+        EXPECT_TRUE(text.StartsWith(shown.Left(shown.length() - 3).Trim())) << width;
+        for (int round = 0; round < 2; ++round)
+            EXPECT_EQ(Compare(
+                          plain,
+                          [&](wxDC& on, int x, int y)
+                          { DrawTextTruncate(on, text, wxRect(x, y, width, 20), 0, false); },
+                          shown),
+                      "")
+                << width << ", round " << round;
     }
+    EXPECT_EQ(TruncateTextToWidth(dc, text, 2, true), wxString()) << "an image cell shows no lone ellipsis";
+    EXPECT_EQ(TruncateTextToWidth(dc, text, 2, false), wxS("..."));
 }
+} // namespace
