@@ -54,42 +54,43 @@ protected:
     JobLogManager m_model{m_root.JournalPath()};
 };
 
-TEST(LogLineShapes, OnlyEightPiecesMakeARecord)
-{
-    const std::vector<std::pair<const char*, bool>> lines = {
-        {"k\th\tf\ts\t1\tst\td\tADDED", true},
-        {"k\th\tf\ts\t1\tst\tADDED", false},
-        {"k\th\t\ts\t1\tst\td\tADDED", false}, // an empty piece makes seven
-        {"k\th\tf\ts\t1\tst\td\tx\tADDED", false},
-        {"\tk\th\tf\ts\t1\tst\td\tADDED\t", true},
-        {"k\t\th\tf\ts\t1\tst\td\tADDED", true},
-        {"", false},
-        {"\t\t\t", false},
-        {"ключ\th\tf\ts\t1\tÉchec\td\tADDED", true}};
-    for (const auto& [line, taken] : lines)
-    {
-        JobRecord record;
-        wxString action;
-        EXPECT_EQ(taken, SplitLogLine(wxString::FromUTF8(line), record, action)) << line;
-    }
-}
-
+// Only lines of eight pieces (empty ones do not count) make a record; the first read takes all of them.
 TEST_F(LogModel, FirstReadTakesEveryWholeLineDuplicatesIncludedAndPlacesTheFields)
 {
-    Write("K1\t/hf/In\t/hf/In/a.pdf\tPRN-7\t" + logtest::SampleDosTime() +
-          "\tDisk full\tno space\tADDED\r\n" + "k\th\tf\ts\t1\tst\tADDED\r\n\r\n\t\t\r\n" +
+    const wxString k1 =
+        "K1\t/hf/In\t/hf/In/a.pdf\tPRN-7\t" + logtest::SampleDosTime() + "\tDisk full\tno space\tADDED";
+    Write(k1 + "\r\n" +
+          wxString::FromUTF8("k2\th\tf\ts\t1\tst\tADDED\r\n"
+                             "k3\th\t\ts\t1\tst\td\tADDED\r\n"
+                             "k4\th\tf\ts\t1\tst\td\tx\tADDED\r\n"
+                             "\tk5\th\tf\ts\t1\tst\td\tADDED\t\r\n"
+                             "k6\t\th\tf\ts\t1\tst\td\tADDED\r\n\r\n\t\t\t\r\n"
+                             "ключ\th\tf\ts\t1\tÉchec\td\tADDED\r\n") +
           LogLine("42", "COMMIT") + LogLine("42", "MODIFIED"));
     // Written before the model starts: its first poll reads it all the same.
     JobLogManager model(m_root.JournalPath());
     EXPECT_EQ(1, model.Parse());
-    EXPECT_EQ((Keys{"K1", "42", "42"}), All(model));
-    EXPECT_EQ(3u, New(model).size());
+    EXPECT_EQ((Keys{"K1", "k5", "k6", wxString::FromUTF8("ключ"), "42", "42"}), All(model));
+    EXPECT_EQ(6u, New(model).size());
     std::vector<JobRecord> records;
     model.GetAllRecords(records);
-    EXPECT_EQ(records[0],
-              (JobRecord{"K1", "/hf/In/a.pdf", "/hf/In", "PRN-7", FormatDosTime(logtest::SampleDosTime()),
-                         "Disk full", "no space", logtest::SampleDosTime()}));
+    const JobRecord expected{"K1",
+                             "/hf/In/a.pdf",
+                             "/hf/In",
+                             "PRN-7",
+                             FormatDosTime(logtest::SampleDosTime()),
+                             "Disk full",
+                             "no space",
+                             logtest::SampleDosTime()};
+    EXPECT_EQ(records[0], expected);
     EXPECT_FALSE(records[0][LogField::TimeText].empty());
+    JobRecord split;
+    wxString action;
+    ASSERT_TRUE(SplitLogLine(k1, split, action));
+    EXPECT_EQ(action, "ADDED");
+    split[LogField::TimeText] = expected[LogField::TimeText]; // left to the caller
+    EXPECT_EQ(split, expected);
+    EXPECT_FALSE(SplitLogLine("k\th\tf\ts\t1\tst\tADDED", split, action));
 
     // An unchanged poll leaves no new records; the same lines again, as a new file, bring nothing.
     EXPECT_EQ(0, model.Parse());
@@ -97,7 +98,7 @@ TEST_F(LogModel, FirstReadTakesEveryWholeLineDuplicatesIncludedAndPlacesTheField
     wxRemoveFile(m_root.JournalPath());
     Write(LogLine("K1", "ADDED") + LogLine("42", "ADDED"));
     EXPECT_EQ(0, model.Parse());
-    EXPECT_EQ(3u, model.GetRecordCount());
+    EXPECT_EQ(6u, model.GetRecordCount());
 }
 
 TEST_F(LogModel, AnEmptyJournalStillEndsTheFirstReadAndAStoppedModelTakesNothing)
