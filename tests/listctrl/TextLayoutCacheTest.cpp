@@ -38,62 +38,42 @@ const wxString kTexts[] = {wxS("Transferring to server"),
                            wxString::FromUTF8("M\xC3\xBCnchen \xE2\x80\x93 caf\xC3\xA9"), wxS("12,345 KB"),
                            wxString::FromUTF8("\xE5\x8D\xB0\xE5\x88\xB7 job.pdf")};
 
-TEST(ListTextLayout, DrawsWhatDrawTextDrawsFromTheFirstAndTheKeptLayout)
+TEST(ListTextLayout, DrawsWhatDrawTextDrawsAndKeepsLayoutsPerFont)
 {
     TextLayoutCache cache;
-    for (const Paint& style : {Style(*wxNORMAL_FONT, wxColour(20, 20, 20)),
-                               Style(wxFont(*wxNORMAL_FONT).Bold(), wxColour(0, 90, 200)),
-                               Style(wxFont(wxFontInfo(15).Family(wxFONTFAMILY_SWISS)), wxColour(200, 0, 0))})
+    const auto byCache = [](TextLayoutCache& from, const wxString& text)
+    { return [&from, text](wxDC& dc, int x, int y) { from.DrawText(dc, text, x, y); }; };
+    // The layouts kept after the first text of each style: an equal font in another object keeps them all.
+    const wxColour grey(20, 20, 20);
+    const std::pair<Paint, size_t> styles[] = {
+        {Style(*wxNORMAL_FONT, grey), 1},
+        {Style(wxFont(*wxNORMAL_FONT), grey), std::size(kTexts)},
+        {Style(wxFont(*wxNORMAL_FONT).Bold(), wxColour(0, 90, 200)), 1},
+        {Style(wxFont(wxFontInfo(15).Family(wxFONTFAMILY_SWISS)), *wxRED), 1}};
+    for (const auto& [style, keptAfterFirst] : styles)
         for (const wxString& text : kTexts)
             for (int round = 0; round < 2; ++round)
-                EXPECT_EQ(Compare(
-                              style, [&](wxDC& dc, int x, int y) { cache.DrawText(dc, text, x, y); }, text),
-                          "")
-                    << text << ", round " << round;
-}
-
-TEST(ListTextLayout, KeepsItsLayoutsForAnEqualFontAndForgetsThemForAnother)
-{
-    TextLayoutCache cache;
-    const auto drawFirst = [&](const Paint& style)
-    {
-        pixels::Render(wxSize(1, 1), *wxWHITE,
-                       [&](wxDC& dc) { style(dc), cache.DrawText(dc, kTexts[0], 0, 0); });
-    };
-    for (const wxString& text : kTexts)
-        pixels::Render(wxSize(1, 1), *wxWHITE,
-                       [&](wxDC& dc)
-                       { Style(*wxNORMAL_FONT, *wxBLACK)(dc), cache.DrawText(dc, text, 0, 0); });
+            {
+                EXPECT_EQ(Compare(style, byCache(cache, text), text), "") << text << ", round " << round;
+                if (text == kTexts[0])
+                    EXPECT_EQ(cache.Size(), keptAfterFirst);
+            }
     EXPECT_EQ(cache.Size(), std::size(kTexts));
-    drawFirst(Style(wxFont(*wxNORMAL_FONT), *wxBLACK));
-    EXPECT_EQ(cache.Size(), std::size(kTexts)) << "an equal font in another object";
-    const Paint bold = Style(wxFont(*wxNORMAL_FONT).Bold(), *wxBLACK);
-    EXPECT_EQ(Compare(
-                  bold, [&](wxDC& dc, int x, int y) { cache.DrawText(dc, kTexts[0], x, y); }, kTexts[0]),
-              "");
-    EXPECT_EQ(cache.Size(), 1u);
-}
 
-TEST(ListTextLayout, LeavesWhatItCannotDrawAloneToDrawText)
-{
-    TextLayoutCache cache;
-    const Paint plain = Style(*wxNORMAL_FONT, *wxBLACK);
-    const Paint onYellow = [&](wxDC& dc)
+    // What it cannot draw alone it leaves to DrawText, and keeps nothing of it.
+    TextLayoutCache other;
+    const Paint onYellow = [](wxDC& dc)
     {
-        plain(dc);
+        Style(*wxNORMAL_FONT, *wxBLACK)(dc);
         dc.SetBackgroundMode(wxBRUSHSTYLE_SOLID);
         dc.SetTextBackground(wxColour(255, 255, 0));
     };
-    const std::pair<Paint, wxString> cases[] = {
-        {Style(wxFont(*wxNORMAL_FONT).Underlined(), *wxBLACK), wxS("underlined")},
-        {onYellow, wxS("on yellow")},
-        {plain, wxS("two\nlines")}};
-    for (const auto& [setUp, text] : cases)
-        EXPECT_EQ(Compare(
-                      setUp, [&](wxDC& dc, int x, int y) { cache.DrawText(dc, text, x, y); }, text),
-                  "")
-            << text;
-    EXPECT_EQ(cache.Size(), 0u);
+    EXPECT_EQ(Compare(Style(wxFont(*wxNORMAL_FONT).Underlined(), *wxBLACK), byCache(other, "underlined"),
+                      "underlined"),
+              "");
+    EXPECT_EQ(Compare(onYellow, byCache(other, "on yellow"), "on yellow"), "");
+    EXPECT_EQ(Compare(Style(*wxNORMAL_FONT, *wxBLACK), byCache(other, "two\nlines"), "two\nlines"), "");
+    EXPECT_EQ(other.Size(), 0u);
 }
 
 // What a cell too narrow for its text shows: the longest start that fits with an ellipsis.
@@ -112,14 +92,10 @@ TEST(ListTruncate, ShortensWithAnEllipsisWithinTheWidthAndDrawsItAsDrawText)
         EXPECT_TRUE(shown.EndsWith(wxS("..."))) << width;
         EXPECT_LE(dc.GetTextExtent(shown).GetWidth(), width) << width;
         EXPECT_TRUE(text.StartsWith(shown.Left(shown.length() - 3).Trim())) << width;
+        const auto drawn = [&text, width](wxDC& on, int x, int y)
+        { DrawTextTruncate(on, text, wxRect(x, y, width, 20), 0, false); };
         for (int round = 0; round < 2; ++round)
-            EXPECT_EQ(Compare(
-                          plain,
-                          [&](wxDC& on, int x, int y)
-                          { DrawTextTruncate(on, text, wxRect(x, y, width, 20), 0, false); },
-                          shown),
-                      "")
-                << width << ", round " << round;
+            EXPECT_EQ(Compare(plain, drawn, shown), "") << width << ", round " << round;
     }
     EXPECT_EQ(TruncateTextToWidth(dc, text, 2, true), wxString()) << "an image cell shows no lone ellipsis";
     EXPECT_EQ(TruncateTextToWidth(dc, text, 2, false), wxS("..."));
