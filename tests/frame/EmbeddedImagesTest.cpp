@@ -76,7 +76,7 @@ TEST(EmbeddedImages, HaveTheirSizeAndKind)
     }
 }
 
-// The first and last rows that hold part of a sort mark, and the mark's width in a row.
+// The width of a sort mark in a row: the pixels that are not magenta.
 int MarkWidth(const wxImage& image, int y)
 {
     int width = 0;

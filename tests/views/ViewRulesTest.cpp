@@ -45,7 +45,7 @@ TEST(ViewRules, PathsNameTheFileAndTheFolderAsTheTableShowsThem)
         EXPECT_EQ(LastPathComponent(path) + "|" + FileTitle(path), wxString(last) + "|" + title) << path;
 }
 
-TEST(ViewRules, FiltersMatchIgnoringCaseAndTrailingSpaceAndMergeKeepsRespectingCase)
+TEST(ViewRules, FiltersMatchIgnoringCaseAndTrailingSpaceAndMergeTellsCaseApart)
 {
     EXPECT_TRUE(SameFilterText("srv1", "SRV1 \t"));
     EXPECT_FALSE(SameFilterText(" srv1", "srv1"));
