@@ -6,7 +6,6 @@
 #include <sys/stat.h>
 
 #include <algorithm>
-#include <cstring>
 #include <fstream>
 #include <optional>
 #include <sstream>
@@ -16,16 +15,12 @@
 #include "ProgramSession.h"
 #include "TempFolder.h"
 
-extern char** environ;
-
-namespace
-{
-
+namespace fs = std::filesystem;
 using programtest::Program;
 using programtest::XSession;
+using Strings = std::vector<std::string>;
 
 const char* const kTitle = "Kelvo Duv Ureruve - Status & Log";
-constexpr uid_t kOtherUser = 65534;
 
 // A private system root, home and runtime folder for the copies of one test.
 class ProgramTest : public ::testing::Test
@@ -33,42 +28,40 @@ class ProgramTest : public ::testing::Test
 protected:
     void SetUp() override
     {
-        ASSERT_FALSE(folder.Path().empty());
         ASSERT_TRUE(x.IsOpen()) << "no X display: run the tests under xvfb-run -a";
-        // Readable by another user, for the tests that start one.
-        ::chmod(folder.Path().c_str(), 0755);
+        ::chmod(folder.Path().c_str(), 0755); // readable by another user, for the test that starts one
+        fs::create_directories(Data());
+        std::ofstream(Data() / "TiveraJobsStatusFile.txt").flush();
     }
 
+    fs::path Data() const { return folder.Path() / "root/var/lib/Corvane/HotFolders"; }
+
     // The environment of a copy whose home folder is home (below the test folder).
-    std::vector<std::string> Environment(const std::string& home, std::optional<uid_t> owner = std::nullopt)
+    Strings Environment(const std::string& home, std::optional<uid_t> owner = std::nullopt)
     {
-        const std::filesystem::path homePath = folder.Path() / home;
-        const std::filesystem::path runtime = homePath / "run";
-        std::filesystem::create_directories(runtime);
+        const fs::path homePath = folder.Path() / home, runtime = homePath / "run";
+        fs::create_directories(runtime);
         ::chmod(runtime.c_str(), 0700);
-        std::vector<std::string> environment = {
-            "HOME=" + homePath.string(),
-            "WYX_SYSTEM_ROOT=" + (folder.Path() / "root").string(),
-            "XDG_CONFIG_HOME=" + (homePath / ".config").string(),
-            "XDG_STATE_HOME=" + (homePath / ".local/state").string(),
-            "XDG_RUNTIME_DIR=" + runtime.string(),
-            "NO_AT_BRIDGE=1",
-            "GDK_BACKEND=x11",
-            "LANG=C.UTF-8",
-            "WYX_TEST_CRASH_LOG=" + crashLog.string(),
-        };
+        Strings environment = {"HOME=" + homePath.string(),
+                               "WYX_SYSTEM_ROOT=" + (folder.Path() / "root").string(),
+                               "XDG_CONFIG_HOME=" + (homePath / ".config").string(),
+                               "XDG_STATE_HOME=" + (homePath / ".local/state").string(),
+                               "XDG_RUNTIME_DIR=" + runtime.string(),
+                               "NO_AT_BRIDGE=1",
+                               "GDK_BACKEND=x11",
+                               "LANG=C.UTF-8",
+                               "WYX_TEST_CRASH_LOG=" + crashLog.string()};
         for (const char* name : {"DISPLAY", "PATH"})
             if (const char* value = ::getenv(name))
                 environment.push_back(std::string(name) + "=" + value);
         if (const char* authority = ::getenv("XAUTHORITY"))
         {
             // The other user cannot read root's copy of the display's cookie.
-            const std::filesystem::path copy = homePath / ".Xauthority";
-            std::filesystem::copy_file(authority, copy, std::filesystem::copy_options::overwrite_existing);
-            environment.push_back("XAUTHORITY=" + copy.string());
+            fs::copy_file(authority, homePath / ".Xauthority", fs::copy_options::overwrite_existing);
+            environment.push_back("XAUTHORITY=" + (homePath / ".Xauthority").string());
         }
-        if (owner)
-            for (const auto& entry : std::filesystem::recursive_directory_iterator(homePath))
+        for (const auto& entry : fs::recursive_directory_iterator(homePath))
+            if (owner)
                 ::chown(entry.path().c_str(), *owner, *owner);
         if (owner)
             ::chown(homePath.c_str(), *owner, *owner);
@@ -77,29 +70,27 @@ protected:
 
     // The program with its libraries and files in a folder every user can
     // read: the build folder may sit below a home that others cannot enter.
-    std::filesystem::path InstalledCopy()
+    fs::path InstalledCopy()
     {
-        const std::filesystem::path source = std::filesystem::path(WYX_PROGRAM).parent_path();
-        const std::filesystem::path target = folder.Path() / "bin";
-        std::filesystem::create_directories(target);
-        for (const auto& entry : std::filesystem::directory_iterator(source))
+        const fs::path program = WYX_PROGRAM, target = folder.Path() / "bin";
+        fs::create_directories(target);
+        for (const auto& entry : fs::directory_iterator(program.parent_path()))
         {
-            const std::string name = entry.path().filename().string();
-            const bool needed = name == std::filesystem::path(WYX_PROGRAM).filename().string() ||
-                                name.find(".so") != std::string::npos || entry.path().extension() == ".cfg" ||
-                                entry.path().extension() == ".ico";
-            if (needed && entry.is_regular_file())
-                std::filesystem::copy_file(entry.path(), target / name);
+            const std::string name = entry.path().filename().string(),
+                              extension = entry.path().extension().string();
+            if (entry.is_regular_file() &&
+                (name == program.filename() || name.find(".so") != std::string::npos || extension == ".cfg" ||
+                 extension == ".ico"))
+                fs::copy_file(entry.path(), target / name);
         }
         ::chmod(target.c_str(), 0755);
-        return target / std::filesystem::path(WYX_PROGRAM).filename();
+        return target / program.filename();
     }
 
     std::string CrashCalls() const
     {
-        std::ifstream file(crashLog);
         std::stringstream text;
-        text << file.rdbuf();
+        text << std::ifstream(crashLog).rdbuf();
         return text.str();
     }
 
@@ -112,53 +103,34 @@ protected:
     }
 
     TempFolder folder;
-    std::filesystem::path crashLog = folder.Path() / "crash-calls.log";
+    fs::path crashLog = folder.Path() / "crash-calls.log";
     XSession x;
 };
 
-TEST_F(ProgramTest, OpensTheTitledWindowAndEndsCleanlyWhenItIsClosed)
+TEST_F(ProgramTest, OpensTheTitledWindowBesideAnotherUsersAndAKilledCopyDoesNotKeepTheNextFromStarting)
 {
-    Program program(WYX_PROGRAM, Environment("home"));
-    const Window window = x.WaitForWindow(program);
-    ASSERT_NE(window, 0u) << "no window: the program " << program.Outcome();
-
-    EXPECT_EQ(x.Title(window), kTitle);
-    const XWindowAttributes attributes = x.Attributes(window);
-    // 800 x 600 at the original platform's font, wider for this one's.
-    EXPECT_GE(attributes.width, 800);
-    EXPECT_GE(attributes.height, 600);
-
-    CloseAndExpectCleanExit(program, window);
-}
-
-TEST_F(ProgramTest, ASecondCopyOfTheSameUserEndsAtOnceWithoutAWindow)
-{
-    const std::vector<std::string> environment = Environment("home");
-    Program first(WYX_PROGRAM, environment);
-    const Window window = x.WaitForWindow(first);
-    ASSERT_NE(window, 0u) << "no window: the program " << first.Outcome();
-
-    Program second(WYX_PROGRAM, environment);
-    // A copy that opened its window would wait for the user; this one ends first.
-    const Window secondWindow = x.WaitForWindow(second);
-    EXPECT_EQ(secondWindow, 0u) << "the second copy opened a window";
-    if (secondWindow != 0)
-        x.RequestClose(secondWindow);
-    const int status = second.Wait();
-    EXPECT_TRUE(WIFEXITED(status)) << "wait status " << status;
-    EXPECT_FALSE(first.HasEnded());
-
-    CloseAndExpectCleanExit(first, window);
-}
-
-TEST_F(ProgramTest, ACopyThatWasKilledDoesNotKeepTheNextOneFromStarting)
-{
-    const std::vector<std::string> environment = Environment("home");
+    const Strings environment = Environment("home");
     {
-        Program killed(WYX_PROGRAM, environment);
-        ASSERT_NE(x.WaitForWindow(killed), 0u) << killed.Outcome();
-        ::kill(killed.Pid(), SIGKILL);
-        killed.Wait();
+        Program first(WYX_PROGRAM, environment);
+        const Window window = x.WaitForWindow(first);
+        ASSERT_NE(window, 0u) << "no window: the program " << first.Outcome();
+        EXPECT_EQ(x.Title(window), kTitle);
+        // 800 x 600 at the original platform's font, wider for this one's.
+        EXPECT_GE(x.Attributes(window).width, 800);
+        EXPECT_GE(x.Attributes(window).height, 600);
+
+        // One copy per user (a second launch is in tests/install), but another
+        // user runs a copy of its own beside the first.
+        if (::geteuid() == 0)
+        {
+            Program other(InstalledCopy().string(), Environment("other-home", 65534), 65534);
+            const Window otherWindow = x.WaitForWindow(other);
+            ASSERT_NE(otherWindow, 0u) << "no window: the other user's copy " << other.Outcome();
+            EXPECT_EQ(x.Title(otherWindow), kTitle);
+            CloseAndExpectCleanExit(other, otherWindow);
+        }
+        ::kill(first.Pid(), SIGKILL);
+        first.Wait();
     }
     // Whatever a lock file says now (here: the id of a live process of this
     // user, as after the killed copy's id was given to another process).
@@ -171,64 +143,31 @@ TEST_F(ProgramTest, ACopyThatWasKilledDoesNotKeepTheNextOneFromStarting)
     CloseAndExpectCleanExit(next, window);
 }
 
-TEST_F(ProgramTest, AnotherUserRunsItsOwnCopyBesideTheFirst)
+TEST_F(ProgramTest, TheCrashReporterIsInstalledAtStartAndUninstalledAtExitAndAPartialOneNeverCalled)
 {
-    if (::geteuid() != 0)
-        GTEST_SKIP() << "starting a copy as another user needs root";
-    Program first(WYX_PROGRAM, Environment("home"));
-    const Window firstWindow = x.WaitForWindow(first);
-    ASSERT_NE(firstWindow, 0u) << "no window: the program " << first.Outcome();
-
-    Program other(InstalledCopy().string(), Environment("other-home", kOtherUser), kOtherUser);
-    const Window otherWindow = x.WaitForWindow(other);
-    ASSERT_NE(otherWindow, 0u) << "no window: the program " << other.Outcome();
-    EXPECT_EQ(x.Title(otherWindow), kTitle);
-
-    CloseAndExpectCleanExit(other, otherWindow);
-    CloseAndExpectCleanExit(first, firstWindow);
+    for (const auto& [library, atStart, atExit] :
+         {std::tuple<std::string, std::string, std::string>{WYX_FULL_REPORTER, "install\n",
+                                                            "install\nuninstall\n"},
+          {WYX_PARTIAL_REPORTER, "", ""}})
+    {
+        fs::remove(crashLog);
+        folder.Write("root/etc/kelvo/registry.ini", "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=" +
+                                                        fs::path(library).parent_path().string() + "\n");
+        Program program(WYX_PROGRAM, Environment("home"));
+        const Window window = x.WaitForWindow(program);
+        ASSERT_NE(window, 0u) << "no window: the program " << program.Outcome();
+        EXPECT_EQ(CrashCalls(), atStart) << library;
+        CloseAndExpectCleanExit(program, window);
+        EXPECT_EQ(CrashCalls(), atExit) << library;
+    }
 }
-
-TEST_F(ProgramTest, TheCrashReporterIsInstalledAtStartAndUninstalledAtExit)
-{
-    const std::string libraryFolder = std::filesystem::path(WYX_FULL_REPORTER).parent_path().string();
-    folder.Write("root/etc/kelvo/registry.ini",
-                 "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=" + libraryFolder + "\n");
-    Program program(WYX_PROGRAM, Environment("home"));
-    const Window window = x.WaitForWindow(program);
-    ASSERT_NE(window, 0u) << "no window: the program " << program.Outcome();
-    EXPECT_EQ(CrashCalls(), "install\n");
-    CloseAndExpectCleanExit(program, window);
-    EXPECT_EQ(CrashCalls(), "install\nuninstall\n");
-}
-
-TEST_F(ProgramTest, AReporterLackingAnEntryIsNeverCalled)
-{
-    const std::string libraryFolder = std::filesystem::path(WYX_PARTIAL_REPORTER).parent_path().string();
-    folder.Write("root/etc/kelvo/registry.ini",
-                 "[SOFTWARE\\Kelvo Systems\\CrashReporter]\nInstallPath=" + libraryFolder + "\n");
-    Program program(WYX_PROGRAM, Environment("home"));
-    const Window window = x.WaitForWindow(program);
-    ASSERT_NE(window, 0u) << "no window: the program " << program.Outcome();
-    CloseAndExpectCleanExit(program, window);
-    EXPECT_EQ(CrashCalls(), "");
-}
-
-} // namespace
 
 // Another process writes the status journal; the running program shows the job
 // and takes it away again, on the display, within a few polls.
 class ProgramWithJournalTest : public ProgramTest
 {
 protected:
-    void SetUp() override
-    {
-        ProgramTest::SetUp();
-        const std::filesystem::path data = folder.Path() / "root/var/lib/Corvane/HotFolders";
-        std::filesystem::create_directories(data);
-        std::ofstream(data / "TiveraJobsStatusFile.txt").flush();
-    }
-
-    int Journal(const std::vector<std::string>& arguments)
+    int Journal(const Strings& arguments)
     {
         Program tool(WYX_JOURNAL, Environment("home"), std::nullopt, arguments);
         const int status = tool.Wait();
@@ -288,11 +227,10 @@ TEST_F(ProgramWithJournalTest, AJobWrittenByAnotherProcessBecomesARowAndLeavesWi
 
 TEST_F(ProgramWithJournalTest, FifosPlantedWhereTheLocksAndAJournalBelongKeepNothingFromClosing)
 {
-    const std::filesystem::path locks = folder.Path() / "root/dev/shm";
-    std::filesystem::create_directories(locks);
-    const std::filesystem::path data = folder.Path() / "root/var/lib/Corvane/HotFolders";
-    for (const std::filesystem::path& fifo : {locks / "TiveraJobsStatusFile.lock", locks / "TiveraJobsLogFile.lock",
-                                              data / "TiveraJobsLogFile.txt"})
+    const fs::path locks = folder.Path() / "root/dev/shm";
+    fs::create_directories(locks);
+    for (const fs::path& fifo : {locks / "TiveraJobsStatusFile.lock", locks / "TiveraJobsLogFile.lock",
+                                 Data() / "TiveraJobsLogFile.txt"})
         ASSERT_EQ(::mkfifo(fifo.c_str(), 0666), 0) << fifo;
     Program program(WYX_PROGRAM, Environment("home"));
     const Window window = x.WaitForWindow(program);
