@@ -262,7 +262,10 @@ TYPED_TEST(JournalPoll, PollerProducerAndViewTogetherLoseAndRepeatNothing)
     std::uint64_t cursor = 0;
     std::vector<JobRecord> shown;
     while (polling)
+    {
         TypeParam::Take(this->m_model, cursor, shown);
+        std::this_thread::yield();
+    }
     producer.join();
     poller.join();
     TypeParam::Take(this->m_model, cursor, shown);
