@@ -11,6 +11,7 @@
 #include <wx/stdpaths.h>
 
 #include <string>
+#include <tuple>
 #include <vector>
 
 namespace
@@ -31,36 +32,25 @@ bool IsMagenta(const wxImage& image, int x, int y)
 TEST(EmbeddedImages, HaveTheirSizeAndKind)
 {
     using namespace wyx::images;
-    enum Kind
-    {
-        Alpha,
-        MaskedOnMagenta,
-        Opaque
-    };
-    struct Case
-    {
-        std::string name;
-        const EmbeddedImage& image;
-        wxSize size;
-        Kind kind;
-    };
-    std::vector<Case> cases = {{"sortAscending", sortMarks[0], {16, 16}, MaskedOnMagenta},
-                               {"sortDescending", sortMarks[1], {16, 16}, MaskedOnMagenta},
-                               {"headerStrip", headerStrip, {1, 23}, Opaque},
-                               {"warning", warning, {16, 16}, Alpha},
-                               {"clearAll", clearAll, {16, 16}, Alpha}};
+    // name, image, size, kind: 'a' with alpha, 'm' on magenta to be masked, 'o' opaque.
+    std::vector<std::tuple<std::string, const EmbeddedImage*, wxSize, char>> cases = {
+        {"sortAscending", &sortMarks[0], {16, 16}, 'm'},
+        {"sortDescending", &sortMarks[1], {16, 16}, 'm'},
+        {"headerStrip", &headerStrip, {1, 23}, 'o'},
+        {"warning", &warning, {16, 16}, 'a'},
+        {"clearAll", &clearAll, {16, 16}, 'a'}};
     for (int i = 0; i < 12; ++i)
-        cases.push_back({"busyWheel" + std::to_string(i), busyWheel[i], {16, 16}, Alpha});
+        cases.emplace_back("busyWheel" + std::to_string(i), &busyWheel[i], wxSize(16, 16), 'a');
     for (int i = 0; i < 3; ++i)
-        cases.push_back({"tab" + std::to_string(i), tabImages[i], {16, 16}, Alpha});
-    for (const Case& c : cases)
+        cases.emplace_back("tab" + std::to_string(i), &tabImages[i], wxSize(16, 16), 'a');
+    for (const auto& [name, data, size, kind] : cases)
     {
-        SCOPED_TRACE(c.name);
-        const wxImage image = Decode(c.image);
+        SCOPED_TRACE(name);
+        const wxImage image = Decode(*data);
         ASSERT_TRUE(image.IsOk());
-        EXPECT_EQ(image.GetSize(), c.size);
-        EXPECT_EQ(image.HasAlpha(), c.kind == Alpha);
-        if (c.kind == Alpha)
+        EXPECT_EQ(image.GetSize(), size);
+        EXPECT_EQ(image.HasAlpha(), kind == 'a');
+        if (kind == 'a')
         {
             // Transparent corners, and something opaque to see.
             EXPECT_EQ(image.GetAlpha(0, 0), 0);
@@ -71,7 +61,7 @@ TEST(EmbeddedImages, HaveTheirSizeAndKind)
             EXPECT_TRUE(anyOpaque);
         }
         // The magenta is what a mask takes away; the mark itself is at the middle.
-        if (c.kind == MaskedOnMagenta)
+        if (kind == 'm')
             EXPECT_TRUE(IsMagenta(image, 0, 0) && !IsMagenta(image, 7, 8));
     }
 }
