@@ -6,6 +6,7 @@
 #include <langinfo.h>
 #include <locale.h>
 
+#include <wx/arrstr.h>
 #include <wx/strconv.h>
 
 #include "data/DosTime.h"
