@@ -19,16 +19,10 @@ namespace
 const char* const kStatus = "TiveraJobsStatusFile";
 const char* const kLog = "TiveraJobsLogFile";
 const std::string kOne = "1\ta\tADDED\r\n";
-const std::vector<Arguments> kWritingOperations = {
-    {"add", "2\tb"}, {"modify", "1\tz"}, {"delete", "1"}, {"remove", "1"}, {"commit", "1"}, {"clear"},
-};
-
-Arguments On(const std::string& journal, const Arguments& operation)
-{
-    Arguments arguments{journal};
-    arguments.insert(arguments.end(), operation.begin(), operation.end());
-    return arguments;
-}
+// On the status journal; the first argument names the journal.
+const std::vector<Arguments> kWritingOperations = {{"status", "add", "2\tb"}, {"status", "modify", "1\tz"},
+                                                   {"status", "delete", "1"}, {"status", "remove", "1"},
+                                                   {"status", "commit", "1"}, {"status", "clear"}};
 
 using JournalLock = JournalTest;
 
@@ -204,50 +198,37 @@ TEST_F(AtomicWrite, ATemporaryFileThatCannotBeMadeLeavesTheJournalIntact)
 
 // --- links another user planted -----------------------------------------------------------
 
-struct LinkCase
-{
-    const char* name;
-    std::vector<bool> ownedByOther; // the chain of links from the journal's path on
-};
+using JournalLink = JournalTest;
 
-class JournalLink : public JournalTest, public ::testing::WithParamInterface<LinkCase>
-{
-};
-
-TEST_P(JournalLink, IsWrittenThroughOnlyWhenEveryLinkIsTheWritersOwn)
+TEST_F(JournalLink, IsWrittenThroughOnlyWhenEveryLinkIsTheWritersOwn)
 {
     if (::geteuid() != 0)
         GTEST_SKIP() << "only root can give a link to another user";
-    const std::vector<bool>& owners = GetParam().ownedByOther;
-    const bool followed = std::find(owners.begin(), owners.end(), true) == owners.end();
     const std::string target = Root() + "/own-file.txt";
     auto link = [&](std::size_t i)
     { return i == 0 ? StatusJournal() : Root() + "/link" + std::to_string(i); };
-    for (const Arguments& operation : kWritingOperations)
-    {
-        SCOPED_TRACE(operation[0]);
-        WriteBytes(target, kOne);
-        for (std::size_t i = 0; i < owners.size(); ++i)
+    // The chain of links from the journal's path on: true where another user owns the link.
+    for (const std::vector<bool>& owners :
+         std::vector<std::vector<bool>>{{false}, {true}, {false, true}, {true, false}, {false, false}})
+        for (const Arguments& operation : kWritingOperations)
         {
-            fs::create_symlink(i + 1 == owners.size() ? target : link(i + 1), link(i));
-            ASSERT_EQ(::lchown(link(i).c_str(), owners[i] ? 4321 : 0, owners[i] ? 4321 : 0), 0);
+            SCOPED_TRACE(::testing::PrintToString(owners) + " " + operation[1]);
+            const bool followed = std::find(owners.begin(), owners.end(), true) == owners.end();
+            WriteBytes(target, kOne);
+            for (std::size_t i = 0; i < owners.size(); ++i)
+            {
+                fs::create_symlink(i + 1 == owners.size() ? target : link(i + 1), link(i));
+                ASSERT_EQ(::lchown(link(i).c_str(), owners[i] ? 4321 : 0, owners[i] ? 4321 : 0), 0);
+            }
+            EXPECT_EQ(RunTool(operation).status, followed ? wyx::JobOk : wyx::JobWriteFailed);
+            EXPECT_EQ(ReadBytes(target) == kOne, !followed);
+            EXPECT_TRUE(fs::is_symlink(StatusJournal()));
+            for (const std::string& entry : FolderEntries(Root()))
+                EXPECT_NE(entry.rfind(".own-file", 0), 0u) << "a temporary was left: " << entry;
+            for (std::size_t i = 0; i < owners.size(); ++i)
+                fs::remove(link(i));
         }
-        EXPECT_EQ(RunTool(On("status", operation)).status, followed ? wyx::JobOk : wyx::JobWriteFailed);
-        EXPECT_EQ(ReadBytes(target) == kOne, !followed);
-        EXPECT_TRUE(fs::is_symlink(StatusJournal()));
-        for (const std::string& entry : FolderEntries(Root()))
-            EXPECT_NE(entry.rfind(".own-file", 0), 0u) << "a temporary was left: " << entry;
-        for (std::size_t i = 0; i < owners.size(); ++i)
-            fs::remove(link(i));
-    }
 }
-
-INSTANTIATE_TEST_SUITE_P(Chains, JournalLink,
-                         ::testing::Values(LinkCase{"Own", {false}}, LinkCase{"Others", {true}},
-                                           LinkCase{"OwnThenOthers", {false, true}},
-                                           LinkCase{"OthersThenOwn", {true, false}},
-                                           LinkCase{"OwnThenOwn", {false, false}}),
-                         [](const auto& info) { return std::string(info.param.name); });
 
 // --- things that are no file, at the journal's path ---------------------------------------
 
@@ -259,15 +240,15 @@ TEST_F(JournalPlant, WhatIsNoFileIsNeitherReadNorWrittenAndNothingWaits)
         {"link to a device", [](const std::string& p) { fs::create_symlink("/dev/zero", p); }},
         {"dangling link", [](const std::string& p) { fs::create_symlink(p + ".gone", p); }}};
     std::vector<Arguments> operations = kWritingOperations;
-    operations.push_back({"read"});
+    operations.push_back({"status", "read"});
     for (const auto& [name, plant] : plants)
     {
         plant(StatusJournal());
         for (const Arguments& operation : operations)
         {
-            const ToolRun run = RunTool(On("status", operation));
-            EXPECT_EQ(run.status, wyx::JobFileMissing) << name << ": " << operation[0];
-            EXPECT_EQ(run.out, "") << name << ": " << operation[0];
+            const ToolRun run = RunTool(operation);
+            EXPECT_EQ(run.status, wyx::JobFileMissing) << name << ": " << operation[1];
+            EXPECT_EQ(run.out, "") << name << ": " << operation[1];
         }
         EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsStatusFile.txt"}) << name;
         fs::remove(StatusJournal());
@@ -286,14 +267,16 @@ TEST_F(JournalPermission, AReadOnlyJournalIsReplacedByRootAloneNeverBehindItsOwn
     fs::permissions(DataDirectory(), fs::perms::all | fs::perms::sticky_bit);
     fs::create_directories(Root() + "/dev/shm");
     fs::permissions(Root() + "/dev/shm", fs::perms::all | fs::perms::sticky_bit);
-    for (const Arguments& operation : kWritingOperations)
+    const std::string asNobody = "exec setpriv --reuid=65534 --regid=65534 --clear-groups ";
+    for (Arguments operation : kWritingOperations)
     {
         WriteBytes(StatusJournal(), kOne);
         ASSERT_EQ(::chmod(StatusJournal().c_str(), 0444), 0);
         ASSERT_EQ(::chown(StatusJournal().c_str(), 65534, 65534), 0);
-        EXPECT_EQ(RunToolAs(65534, On(StatusJournal(), operation)).status, wyx::JobWriteFailed)
-            << operation[0];
-        EXPECT_EQ(ReadBytes(StatusJournal()), kOne) << operation[0];
+        operation[0] = StatusJournal();
+        EXPECT_EQ(Run(asNobody + Quoted(WYX_JOURNAL_TOOL), operation).status, wyx::JobWriteFailed)
+            << operation[1];
+        EXPECT_EQ(ReadBytes(StatusJournal()), kOne) << operation[1];
         EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsStatusFile.txt"});
         ::unlink(StatusJournal().c_str());
     }

@@ -115,14 +115,6 @@ public:
     {
         return Run(prefix + " exec " + Quoted(WYX_JOURNAL_TOOL), arguments);
     }
-    // wyx-journal as another user (root only).
-    static ToolRun RunToolAs(unsigned uid, const Arguments& arguments)
-    {
-        const std::string id = std::to_string(uid);
-        return Run("exec setpriv --reuid=" + id + " --regid=" + id + " --clear-groups " +
-                       Quoted(WYX_JOURNAL_TOOL),
-                   arguments);
-    }
 
     // Polls the kernel's lock table until someone is blocked waiting for the
     // lock file (true), or until finished() says the candidate returned (false).
