@@ -9,115 +9,49 @@
 #include <wx/frame.h>
 #include <wx/intl.h>
 
-#include <sstream>
 #include <tuple>
 #include <vector>
 
 namespace
 {
 
-struct LayoutCase
-{
-    const char* name;
-    const char* text;
-    int clientWidth;
-    int lineHeight;
-    std::vector<std::tuple<int, int, const char*>> lines; // x, y, text
-};
-
-void PrintTo(const LayoutCase& c, std::ostream* out)
-{
-    *out << c.name;
-}
-
-class ErrorPanelLayout : public testing::TestWithParam<LayoutCase>
-{
-};
-
 // With a heading 100 pixels wide and a font of 10 pixels per character the
 // heading's line starts at 109 and holds 195 pixels; later lines start at 4 and
-// hold the client width less 4.
-TEST_P(ErrorPanelLayout, PlacesTheLines)
+// hold the client width less 4. Lines as "x,y:text|"; each text begins with a space.
+TEST(ErrorPanel, PlacesTheLines)
 {
-    const LayoutCase& c = GetParam();
-    const auto measure = [&c](const wxString& text)
-    { return wxSize(10 * static_cast<int>(text.length()), c.lineHeight); };
-    std::ostringstream laidOut;
-    for (const ErrorDetailLine& line :
-         LayoutErrorDetail(SplitErrorDetailWords(c.text), 100, c.clientWidth, measure))
-        laidOut << "(" << line.start.x << ", " << line.start.y << ") \"" << line.text.utf8_string() << "\" ";
-    std::ostringstream expected;
-    for (const auto& [x, y, text] : c.lines)
-        expected << "(" << x << ", " << y << ") \"" << text << "\" ";
-    EXPECT_EQ(laidOut.str(), expected.str());
-}
-
-INSTANTIATE_TEST_SUITE_P(
-    ErrorPanelCases, ErrorPanelLayout,
-    testing::Values(
-        LayoutCase{"EmptyTextGivesNoLine", "", 300, 16, {}},
-        LayoutCase{"WhiteSpaceOnlyGivesNoLine", " \t\r\n  ", 300, 16, {}},
-        LayoutCase{"ShortDetailStandsBesideTheHeading", "Disk full", 300, 16, {{109, 4, " Disk full"}}},
-        LayoutCase{"LineBreakIsReflowed", "Disk\r\nfull", 300, 16, {{109, 4, " Disk full"}}},
-        LayoutCase{"RunsOfBlanksCountAsOne", "  Disk \t\t full \n", 300, 16, {{109, 4, " Disk full"}}},
-        LayoutCase{
-            "ExactFitStaysOnTheLine", "aaaa bbbb cccc dddd", 305, 16, {{109, 4, " aaaa bbbb cccc dddd"}}},
-        LayoutCase{"WordThatDoesNotFitStartsLineTwo",
-                   "aaaa bbbb cccc dddd",
-                   300,
-                   16,
-                   {{109, 4, " aaaa bbbb cccc"}, {4, 20, " dddd"}}},
-        LayoutCase{"FirstWordTooWideLeavesTheHeadingLineEmpty",
-                   "xxxxxxxxxxxxxxxxxxxx",
-                   300,
-                   16,
-                   {{109, 4, ""}, {4, 20, " xxxxxxxxxxxxxxxxxxxx"}}},
-        LayoutCase{"LaterLinesWrapAtTheFullWidth",
-                   "ab cd ef gh ij kl",
-                   120,
-                   13,
-                   {{109, 4, ""}, {4, 17, " ab cd ef"}, {4, 30, " gh ij kl"}}},
-        LayoutCase{"OverlongWordStandsAlone",
-                   "a verylongwordthatoverflows b",
-                   120,
-                   16,
-                   {{109, 4, ""}, {4, 20, " a"}, {4, 36, " verylongwordthatoverflows"}, {4, 52, " b"}}}),
-    [](const testing::TestParamInfo<LayoutCase>& info) { return std::string(info.param.name); });
-
-class ErrorPanel : public testing::Test
-{
-protected:
-    void SetUp() override
+    const std::tuple<const char*, int, int, const char*> cases[] = {
+        {"", 300, 16, ""},
+        {" \t\r\n  ", 300, 16, ""},
+        {"Disk full", 300, 16, "109,4: Disk full|"},
+        {"Disk\r\nfull", 300, 16, "109,4: Disk full|"},
+        {"  Disk \t\t full \n", 300, 16, "109,4: Disk full|"},
+        {"aaaa bbbb cccc dddd", 305, 16, "109,4: aaaa bbbb cccc dddd|"},
+        {"aaaa bbbb cccc dddd", 300, 16, "109,4: aaaa bbbb cccc|4,20: dddd|"},
+        {"xxxxxxxxxxxxxxxxxxxx", 300, 16, "109,4:|4,20: xxxxxxxxxxxxxxxxxxxx|"},
+        {"ab cd ef gh ij kl", 120, 13, "109,4:|4,17: ab cd ef|4,30: gh ij kl|"},
+        {"a verylongwordthatoverflows b", 120, 16,
+         "109,4:|4,20: a|4,36: verylongwordthatoverflows|4,52: b|"}};
+    for (const auto& [text, width, lineHeight, expected] : cases)
     {
-        frame = new wxFrame(nullptr, wxID_ANY, "error panel", wxDefaultPosition, wxSize(500, 200));
-        panel = new CErrorWndBkgLog(frame, wxID_ANY);
+        const auto measure = [height = lineHeight](const wxString& line)
+        { return wxSize(10 * static_cast<int>(line.length()), height); };
+        std::string laidOut;
+        for (const ErrorDetailLine& line :
+             LayoutErrorDetail(SplitErrorDetailWords(text), 100, width, measure))
+            laidOut += std::to_string(line.start.x) + "," + std::to_string(line.start.y) + ":" +
+                       line.text.utf8_string() + "|";
+        EXPECT_EQ(laidOut, expected) << "\"" << text << "\" in " << width;
     }
-
-    void TearDown() override
-    {
-        frame->Destroy();
-        guitest::Pump(0);
-    }
-
-    wxFrame* frame = nullptr;
-    CErrorWndBkgLog* panel = nullptr;
-};
-
-TEST_F(ErrorPanel, KeepsTheTextInItsLabelAndRepaintsWhollyWhenResized)
-{
-    EXPECT_EQ(panel->GetErrorText(), "");
-    panel->SetErrorText("Disk full");
-    EXPECT_EQ(panel->GetErrorText(), "Disk full");
-    EXPECT_EQ(panel->GetLabel(), _("Error Detail:") + "Disk full");
-    panel->SetErrorText("");
-    EXPECT_EQ(panel->GetLabel(), _("Error Detail:"));
-    EXPECT_TRUE(panel->HasFlag(wxFULL_REPAINT_ON_RESIZE)) << "narrowing rewraps";
 }
 
 // What the user reads: the heading in the title font and the wrapped detail in
 // the text font, black on the panel's own background, which fills the panel.
-TEST_F(ErrorPanel, ShowsTheHeadingAndTheWrappedDetailOnItsBackground)
+TEST(ErrorPanel, ShowsTheHeadingAndTheWrappedDetailOnItsBackgroundAndKeepsTheText)
 {
+    auto* frame = new wxFrame(nullptr, wxID_ANY, "error panel");
+    auto* panel = new CErrorWndBkgLog(frame, wxID_ANY);
+    EXPECT_TRUE(panel->HasFlag(wxFULL_REPAINT_ON_RESIZE)) << "narrowing rewraps";
     const wxColour background(0xFF, 0xF4, 0xE5);
     panel->SetBackgroundColour(background);
     const Theme& theme = Themer::GetThemeService()->GetTheme("Error");
@@ -149,8 +83,15 @@ TEST_F(ErrorPanel, ShowsTheHeadingAndTheWrappedDetailOnItsBackground)
         EXPECT_EQ(pixels::FirstDifference(painted, expected), "");
     };
     expect({});
+    EXPECT_EQ(panel->GetErrorText(), "");
     panel->SetErrorText("Transfer\nfailed");
     expect({{{headingSize.x + 9, 4}, " Transfer"}, {{4, 4 + firstSize.y}, " failed"}});
+    EXPECT_EQ(panel->GetErrorText(), "Transfer\nfailed");
+    EXPECT_EQ(panel->GetLabel(), _("Error Detail:") + "Transfer\nfailed");
+    panel->SetErrorText("");
+    EXPECT_EQ(panel->GetLabel(), _("Error Detail:"));
+    frame->Destroy();
+    guitest::Pump(0);
 }
 
 } // namespace

@@ -8,6 +8,7 @@
 #include <wx/settings.h>
 #include <wx/uiaction.h>
 
+#include <algorithm>
 #include <vector>
 
 namespace
@@ -56,133 +57,86 @@ protected:
     std::vector<std::pair<int, wxString>> clicks;
 };
 
-struct LookCase
-{
-    const char* name;
-    wxSize size;
-    const char* text;
-    wxSize image; // 0 x 0: none
-    std::int32_t placement;
-    bool ownColours; // kInk on kField, else the default white on black
-    int textX;
-    wxPoint imageAt;
-};
-
-void PrintTo(const LookCase& c, std::ostream* out)
-{
-    *out << c.name;
-}
-
-class ButtonLook : public ButtonTest, public testing::WithParamInterface<LookCase>
-{
-};
-
 // The field, then the text centred vertically and the image where they belong.
-TEST_P(ButtonLook, ShowsTheTextAndTheImageInPlace)
+TEST_F(ButtonTest, ShowsTheTextAndTheImageInPlace)
 {
-    const LookCase& c = GetParam();
-    ImageTextButton* button = MakeButton(c.size);
-    EXPECT_EQ(button->GetFont(), wxSystemSettings::GetFont(wxSYS_DEFAULT_GUI_FONT));
-    button->SetText(c.text);
-    const wxBitmap image = c.image.x > 0 ? SolidImage(c.image) : wxNullBitmap;
-    if (image.IsOk())
-        button->SetBitmap(image, c.placement);
-    if (c.ownColours)
+    struct Look
     {
-        button->SetButtonBackground(kField);
-        button->SetTextColour(kInk);
+        wxSize size;
+        const char* text;
+        wxSize image; // 0 x 0: none
+        std::int32_t placement;
+        bool ownColours; // kInk on kField, else the default white on black
+        int textX;
+        wxPoint imageAt;
+    };
+    const Look looks[] = {{{115, 20}, "Clear All", {0, 0}, ImageTextButton::kImageFirst, false, 0, {}},
+                          {{115, 20}, "Clear All", {8, 8}, ImageTextButton::kImageFirst, true, 10, {0, 6}},
+                          {{115, 20}, "Clear All", {8, 8}, ImageTextButton::kImageLast, true, 0, {105, 6}},
+                          // A text longer than the button runs under the image at the end.
+                          {{40, 20},
+                           "A text much longer than the button",
+                           {8, 8},
+                           ImageTextButton::kImageLast,
+                           false,
+                           0,
+                           {30, 6}},
+                          {{30, 21}, "", {6, 5}, ImageTextButton::kImageFirst, false, 0, {0, 8}}};
+    for (const Look& c : looks)
+    {
+        ImageTextButton* button = MakeButton(c.size);
+        EXPECT_EQ(button->GetFont(), wxSystemSettings::GetFont(wxSYS_DEFAULT_GUI_FONT));
+        button->SetText(c.text);
+        const wxBitmap image = c.image.x > 0 ? SolidImage(c.image) : wxNullBitmap;
+        if (image.IsOk())
+            button->SetBitmap(image, c.placement);
+        if (c.ownColours)
+        {
+            button->SetButtonBackground(kField);
+            button->SetTextColour(kInk);
+        }
+        const wxImage expected =
+            pixels::Render(c.size, c.ownColours ? kField : *wxBLACK,
+                           [&](wxDC& dc)
+                           {
+                               dc.SetFont(button->GetFont());
+                               dc.SetTextForeground(c.ownColours ? kInk : *wxWHITE);
+                               dc.DrawText(c.text, c.textX, (c.size.y - button->GetTextExtent(c.text).y) / 2);
+                               if (image.IsOk())
+                                   dc.DrawBitmap(image, c.imageAt, true);
+                           });
+        EXPECT_EQ(pixels::FirstDifference(Paint(*button, c.size), expected), "") << c.text << " " << c.size.x;
     }
-    const wxImage expected = pixels::Render(c.size, c.ownColours ? kField : *wxBLACK,
-                                            [&](wxDC& dc)
-                                            {
-                                                dc.SetFont(button->GetFont());
-                                                dc.SetTextForeground(c.ownColours ? kInk : *wxWHITE);
-                                                const int y =
-                                                    (c.size.y - button->GetTextExtent(c.text).y) / 2;
-                                                dc.DrawText(c.text, c.textX, y);
-                                                if (image.IsOk())
-                                                    dc.DrawBitmap(image, c.imageAt, true);
-                                            });
-    EXPECT_EQ(pixels::FirstDifference(Paint(*button, c.size), expected), "");
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    ButtonLooks, ButtonLook,
-    testing::Values(
-        LookCase{"TextAloneWhiteOnBlack",
-                 {115, 20},
-                 "Clear All",
-                 {0, 0},
-                 ImageTextButton::kImageFirst,
-                 false,
-                 0,
-                 {}},
-        LookCase{"ImageFirstTextTwoPixelsAfter",
-                 {115, 20},
-                 "Clear All",
-                 {8, 8},
-                 ImageTextButton::kImageFirst,
-                 true,
-                 10,
-                 {0, 6}},
-        LookCase{"ImageLastTwoPixelsInside",
-                 {115, 20},
-                 "Clear All",
-                 {8, 8},
-                 ImageTextButton::kImageLast,
-                 true,
-                 0,
-                 {105, 6}},
-        LookCase{"LongTextRunsUnderTheImage",
-                 {40, 20},
-                 "A text much longer than the button",
-                 {8, 8},
-                 ImageTextButton::kImageLast,
-                 false,
-                 0,
-                 {30, 6}},
-        LookCase{"ImageAloneCentred", {30, 21}, "", {6, 5}, ImageTextButton::kImageFirst, false, 0, {0, 8}}),
-    [](const testing::TestParamInfo<LookCase>& info) { return std::string(info.param.name); });
-
-struct SeparatorCase
+// A separator draws two grey lines through the middle, across the longer side, and nothing else.
+TEST_F(ButtonTest, SeparatorsShowTwoGreyLines)
 {
-    wxSize size;
-    bool vertical; // lines drawn: columns when vertical, rows when horizontal
-    int first;
-};
-
-class ButtonSeparator : public ButtonTest, public testing::WithParamInterface<SeparatorCase>
-{
-};
-
-TEST_P(ButtonSeparator, DrawsTwoGreyLinesThroughTheMiddleAndNothingElse)
-{
-    const SeparatorCase& c = GetParam();
-    ImageTextButton* button = MakeButton(c.size);
-    button->SetBackgroundColour(kPaper);
-    button->SetText("not shown");
-    button->SetBitmap(SolidImage({4, 4}), ImageTextButton::kImageFirst);
-    button->SetSeparator();
-    ASSERT_TRUE(button->IsSeparator());
-    const wxImage expected =
-        pixels::Render(c.size, kPaper,
-                       [&](wxDC& dc)
-                       {
-                           dc.SetPen(wxPen(wxColour(128, 128, 128)));
-                           for (int line = c.first; line <= c.first + 1; ++line)
-                               for (int along = 0; along < (c.vertical ? c.size.y : c.size.x); ++along)
-                                   dc.DrawPoint(c.vertical ? line : along, c.vertical ? along : line);
-                       });
-    EXPECT_EQ(pixels::FirstDifference(Paint(*button, c.size), expected), "");
+    // Size and the first line: columns when taller than wide, else rows. The view's 1 x 20
+    // separator has columns -1 and 0, so only column 0 shows.
+    const std::pair<wxSize, int> shapes[] = {
+        {{1, 20}, -1}, {{10, 40}, 4}, {{11, 40}, 4}, {{40, 10}, 4}, {{12, 12}, 5}};
+    for (const auto& [size, first] : shapes)
+    {
+        ImageTextButton* button = MakeButton(size);
+        button->SetBackgroundColour(kPaper);
+        button->SetText("not shown");
+        button->SetBitmap(SolidImage({4, 4}), ImageTextButton::kImageFirst);
+        button->SetSeparator();
+        EXPECT_TRUE(button->IsSeparator());
+        const bool vertical = size.y > size.x;
+        const wxImage expected =
+            pixels::Render(size, kPaper,
+                           [&](wxDC& dc)
+                           {
+                               dc.SetPen(wxPen(wxColour(128, 128, 128)));
+                               for (int along = 0; along < std::max(size.x, size.y); ++along)
+                                   for (int line = first; line <= first + 1; ++line)
+                                       dc.DrawPoint(vertical ? line : along, vertical ? along : line);
+                           });
+        EXPECT_EQ(pixels::FirstDifference(Paint(*button, size), expected), "") << size.x << " x " << size.y;
+    }
 }
-
-INSTANTIATE_TEST_SUITE_P(ButtonShapes, ButtonSeparator,
-                         testing::Values(
-                             // The view's 1 x 20 separator: columns -1 and 0, so only column 0 shows.
-                             SeparatorCase{wxSize(1, 20), true, -1}, SeparatorCase{wxSize(10, 40), true, 4},
-                             SeparatorCase{wxSize(11, 40), true, 4}, SeparatorCase{wxSize(40, 10), false, 4},
-                             // Square: horizontal.
-                             SeparatorCase{wxSize(12, 12), false, 5}));
 
 TEST_F(ButtonTest, EachPressPostsTheIdAndTheTextWithoutTrailingBlanks)
 {
