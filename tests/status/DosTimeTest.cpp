@@ -142,7 +142,8 @@ TEST(StrftimeConversion, GivesTheWindowsLettersOrRefuses)
                "dd\xE6\x97\xA5"},
           Case{"%H:%M:%S", T, "HH:mm:ss"}, Case{"%T", T, "HH:mm:ss"}, Case{"%R", T, "HH:mm"},
           Case{"%r", T, "hh:mm:ss tt"}, Case{"%k:%M", T, "H:mm"}, Case{"%l:%M %p", T, "h:mm tt"},
-          Case{"%H%%%M", T, "HH%mm"}, Case{"%Y-%m-%d KW", D, "yyyy-MM-dd KW"}, Case{"%M%S", T, "mmss"},
+          Case{"%H.%M.%S", T, "HH.mm.ss"}, Case{"%H%%%M", T, "HH%mm"},
+          Case{"%Y-%m-%d KW", D, "yyyy-MM-dd KW"}, Case{"%M%S", T, "mmss"},
           // A literal letter the walker would read as a field.
           Case{"%Hh%M", T, nullptr}, Case{"%d de %B", D, nullptr}, Case{"%Y y", D, nullptr},
           Case{"%H:%M Uhr", T, nullptr},

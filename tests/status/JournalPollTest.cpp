@@ -118,7 +118,8 @@ TYPED_TEST_SUITE(JournalPoll, ModelKinds);
 
 TYPED_TEST(JournalPoll, ChangeMadeWhileTheProducerHoldsTheLockIsReadLater)
 {
-    EXPECT_EQ(this->m_model.Parse(), 0) << "no journal yet";
+    EXPECT_EQ(this->m_model.Refresh(), 0);
+    EXPECT_EQ(this->Updates(), 0) << "no journal yet, and no news";
     this->Write({"1"});
     {
         named_mutex_lock producer(TypeParam::kJournal);
