@@ -11,7 +11,9 @@
 #include <wx/frame.h>
 #include <wx/panel.h>
 
+#include <array>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace
@@ -58,6 +60,21 @@ std::string Attribute(AtkObject* object, const char* name)
     return value;
 }
 
+// Where an object stands: x, y, width, height.
+std::array<int, 4> Extents(AtkObject* object, AtkCoordType type)
+{
+    gint x = 0, y = 0, width = 0, height = 0;
+    atk_component_get_extents(ATK_COMPONENT(object), &x, &y, &width, &height, type);
+    return {x, y, width, height};
+}
+
+std::pair<int, int> Position(AtkObject* cell)
+{
+    gint row = -1, column = -1;
+    atk_table_cell_get_position(ATK_TABLE_CELL(cell), &row, &column);
+    return {row, column};
+}
+
 // A cell as a tool reads it: asked for, named, released.
 std::string CellText(AtkObject* table, int row, int column)
 {
@@ -68,13 +85,6 @@ std::string CellText(AtkObject* table, int row, int column)
     EXPECT_EQ(Text(cell), name);
     g_object_unref(cell);
     return name;
-}
-
-template <typename Condition> bool PumpUntil(Condition done)
-{
-    for (int round = 0; round < 200 && !done(); ++round)
-        guitest::Pump(10);
-    return done();
 }
 
 // A virtual list that makes its texts from the position and counts the asks.
@@ -96,29 +106,19 @@ struct SignalLog
     int count = 0;
     AtkObject* last = nullptr;
 
-    void Connect(AtkObject* object, const char* signal)
+    static void Count(AtkObject*, SignalLog* log) { ++log->count; }
+    static void Object(AtkObject*, gpointer child, SignalLog* log)
     {
-        g_signal_connect(object, signal, G_CALLBACK(+[](AtkObject*, SignalLog* log) { ++log->count; }), this);
+        ++log->count;
+        log->last = ATK_IS_OBJECT(child) ? ATK_OBJECT(child) : nullptr;
     }
-    void ConnectWithObject(AtkObject* object, const char* signal)
+    static void IndexAndObject(AtkObject* object, guint, gpointer child, SignalLog* log)
     {
-        g_signal_connect(object, signal,
-                         G_CALLBACK(+[](AtkObject*, gpointer child, SignalLog* log)
-                                    {
-                                        ++log->count;
-                                        log->last = ATK_IS_OBJECT(child) ? ATK_OBJECT(child) : nullptr;
-                                    }),
-                         this);
+        Object(object, child, log);
     }
-    void ConnectWithIndexAndObject(AtkObject* object, const char* signal)
+    template <typename Handler> void Connect(AtkObject* object, const char* signal, Handler handler)
     {
-        g_signal_connect(object, signal,
-                         G_CALLBACK(+[](AtkObject*, guint, gpointer child, SignalLog* log)
-                                    {
-                                        ++log->count;
-                                        log->last = ATK_IS_OBJECT(child) ? ATK_OBJECT(child) : nullptr;
-                                    }),
-                         this);
+        g_signal_connect(object, signal, G_CALLBACK(handler), this);
     }
 };
 
@@ -166,7 +166,7 @@ protected:
     wxFrame* frame = nullptr;
 };
 
-TEST_F(AccessibleListTest, TheListIsATableWhoseCellsAndHeadingsReadAsTheListShowsThem)
+TEST_F(AccessibleListTest, TheListIsATableWhoseCellsAndHeadingsReadAndStandAsTheListShowsThem)
 {
     ProfilesKelvoProfilesListCtrl* list = FilledList();
     AtkObject* table = AccessibleOf(list);
@@ -195,11 +195,7 @@ TEST_F(AccessibleListTest, TheListIsATableWhoseCellsAndHeadingsReadAsTheListShow
     EXPECT_EQ(CellText(table, 3, 0), "<none>");
 
     AtkObject* cell = atk_object_ref_accessible_child(table, 7);
-    gint row = -1;
-    gint column = -1;
-    ASSERT_TRUE(atk_table_cell_get_position(ATK_TABLE_CELL(cell), &row, &column));
-    EXPECT_EQ(row, 2);
-    EXPECT_EQ(column, 1);
+    EXPECT_EQ(Position(cell), std::make_pair(2, 1));
     EXPECT_EQ(atk_object_get_parent(cell), table);
     EXPECT_EQ(atk_object_get_index_in_parent(cell), 7);
     EXPECT_EQ(atk_object_get_role(cell), ATK_ROLE_TABLE_CELL);
@@ -209,38 +205,25 @@ TEST_F(AccessibleListTest, TheListIsATableWhoseCellsAndHeadingsReadAsTheListShow
     EXPECT_EQ(Name(ATK_OBJECT(g_ptr_array_index(headers, 0))), "File Name");
     g_ptr_array_unref(headers);
     g_object_unref(cell);
-}
 
-TEST_F(AccessibleListTest, OtherWindowsKeepTheAccessiblesGtkGivesThem)
-{
-    FilledList();
-    auto* panel = new wxPanel(frame);
-    AtkObject* other = AccessibleOf(panel);
-    ASSERT_NE(other, nullptr);
-    EXPECT_FALSE(ATK_IS_TABLE(other));
-    EXPECT_EQ(Attribute(other, "wyx-kind"), "");
-}
-
-TEST_F(AccessibleListTest, CellRectanglesAreWhereTheListDrawsThem)
-{
-    ProfilesKelvoProfilesListCtrl* list = FilledList();
-    AtkObject* table = AccessibleOf(list);
-    AtkObject* cell = atk_table_ref_at(ATK_TABLE(table), 1, 1);
-    gint x = 0, y = 0, width = 0, height = 0;
-    atk_component_get_extents(ATK_COMPONENT(cell), &x, &y, &width, &height, ATK_XY_SCREEN);
+    // A cell stands where the list draws it.
+    cell = atk_table_ref_at(ATK_TABLE(table), 1, 1);
     wxRect drawn;
     ASSERT_TRUE(list->GetSubItemRect(1, 1, drawn));
     const int header = list->GetHeaderWindow()->GetSize().GetHeight();
     const wxPoint origin = list->ClientToScreen(wxPoint(0, 0));
-    EXPECT_EQ(x, origin.x + drawn.x);
-    EXPECT_EQ(y, origin.y + header + drawn.y);
-    EXPECT_EQ(width, 200);
-    EXPECT_EQ(height, drawn.height);
-    atk_component_get_extents(ATK_COMPONENT(cell), &x, &y, &width, &height, ATK_XY_PARENT);
-    EXPECT_EQ(x, drawn.x);
-    EXPECT_EQ(y, header + drawn.y);
+    EXPECT_EQ(Extents(cell, ATK_XY_SCREEN),
+              (std::array<int, 4>{origin.x + drawn.x, origin.y + header + drawn.y, 200, drawn.height}));
+    EXPECT_EQ(Extents(cell, ATK_XY_PARENT),
+              (std::array<int, 4>{drawn.x, header + drawn.y, 200, drawn.height}));
     EXPECT_TRUE(HasState(cell, ATK_STATE_SHOWING));
     g_object_unref(cell);
+
+    // Other windows keep the accessibles GTK gives them.
+    AtkObject* other = AccessibleOf(new wxPanel(frame));
+    ASSERT_NE(other, nullptr);
+    EXPECT_FALSE(ATK_IS_TABLE(other));
+    EXPECT_EQ(Attribute(other, "wyx-kind"), "");
 }
 
 TEST_F(AccessibleListTest, SelectionFocusAndRowChangesReachTheListeners)
@@ -248,9 +231,9 @@ TEST_F(AccessibleListTest, SelectionFocusAndRowChangesReachTheListeners)
     ProfilesKelvoProfilesListCtrl* list = FilledList();
     AtkObject* table = AccessibleOf(list);
     SignalLog selection, descendant, rows, selectedState;
-    selection.Connect(table, "selection-changed");
-    descendant.ConnectWithObject(table, "active-descendant-changed");
-    rows.Connect(table, "visible-data-changed");
+    selection.Connect(table, "selection-changed", SignalLog::Count);
+    descendant.Connect(table, "active-descendant-changed", SignalLog::Object);
+    rows.Connect(table, "visible-data-changed", SignalLog::Count);
     AtkObject* cell = atk_table_ref_at(ATK_TABLE(table), 1, 2);
     g_signal_connect(
         cell, "state-change::selected",
@@ -262,10 +245,7 @@ TEST_F(AccessibleListTest, SelectionFocusAndRowChangesReachTheListeners)
     EXPECT_GE(selection.count, 1);
     EXPECT_EQ(selectedState.count, 1);
     ASSERT_EQ(descendant.count, 1);
-    gint row = -1, column = -1;
-    atk_table_cell_get_position(ATK_TABLE_CELL(descendant.last), &row, &column);
-    EXPECT_EQ(row, 1);
-    EXPECT_EQ(column, 0);
+    EXPECT_EQ(Position(descendant.last), std::make_pair(1, 0));
 
     gint* selected = nullptr;
     ASSERT_EQ(atk_table_get_selected_rows(ATK_TABLE(table), &selected), 1);
@@ -335,9 +315,7 @@ TEST_F(AccessibleListTest, ADestroyedListAnswersAsGoneWhileAToolStillHoldsItsObj
     EXPECT_TRUE(HasState(cell, ATK_STATE_DEFUNCT));
     EXPECT_EQ(Name(cell), "");
     EXPECT_EQ(Text(cell), "");
-    gint x = 0, y = 0, width = 0, height = 0;
-    atk_component_get_extents(ATK_COMPONENT(cell), &x, &y, &width, &height, ATK_XY_SCREEN);
-    EXPECT_EQ(width, -1);
+    EXPECT_EQ(Extents(cell, ATK_XY_SCREEN)[2], -1);
 
     // The table goes first; the cell a tool still holds then has no table at all.
     g_object_unref(table);
@@ -353,7 +331,7 @@ TEST_F(AccessibleListTest, AListMadeAfterTheWindowIsShownIsAnnounced)
     AtkObject* parent = AccessibleOf(frame);
     ASSERT_NE(parent, nullptr);
     SignalLog added;
-    added.ConnectWithIndexAndObject(parent, "children-changed::add");
+    added.Connect(parent, "children-changed::add", SignalLog::IndexAndObject);
 
     ProfilesKelvoProfilesListCtrl* list = MakeList(wxLC_REPORT | wxLC_SINGLE_SEL);
     ASSERT_GE(added.count, 1);
@@ -391,7 +369,7 @@ protected:
     CustomComboBox* combo = nullptr;
 };
 
-TEST_F(AccessibleComboTest, TheBoxIsAComboBoxWithItsEntriesAsAList)
+TEST_F(AccessibleComboTest, TheBoxIsAComboBoxWithItsEntriesAsAListShownWhenDropped)
 {
     AtkObject* box = AccessibleOf(combo);
     ASSERT_TRUE(box && ATK_IS_SELECTION(box)) << "the get_accessible hook did not take effect";
@@ -422,37 +400,29 @@ TEST_F(AccessibleComboTest, TheBoxIsAComboBoxWithItsEntriesAsAList)
     AtkObject* selected = atk_selection_ref_selection(ATK_SELECTION(box), 0);
     EXPECT_EQ(Name(selected), "PRN-01");
     g_object_unref(selected);
-    g_object_unref(list);
-}
 
-TEST_F(AccessibleComboTest, DroppingDownShowsTheListAndTellsTheListeners)
-{
-    AtkObject* box = AccessibleOf(combo);
-    AtkObject* list = atk_object_ref_accessible_child(box, 0);
+    // Dropping down shows the list and tells the listeners.
     SignalLog expanded;
     g_signal_connect(box, "state-change::expanded",
                      G_CALLBACK(+[](AtkObject*, gchar*, gboolean, SignalLog* log) { ++log->count; }),
                      &expanded);
 
     combo->ShowPopup();
-    ASSERT_TRUE(PumpUntil([&] { return combo->IsPopupShown(); }));
+    ASSERT_TRUE(guitest::PumpUntil([&] { return combo->IsPopupShown(); }));
     guitest::Pump(50);
     EXPECT_TRUE(HasState(box, ATK_STATE_EXPANDED));
     EXPECT_TRUE(HasState(list, ATK_STATE_SHOWING));
     EXPECT_GE(expanded.count, 1);
     AtkObject* entry = atk_object_ref_accessible_child(list, 2);
     EXPECT_TRUE(HasState(entry, ATK_STATE_SHOWING));
-    gint x = 0, y = 0, width = 0, height = 0;
-    atk_component_get_extents(ATK_COMPONENT(entry), &x, &y, &width, &height, ATK_XY_SCREEN);
-    EXPECT_EQ(height, CustomComboBox::kItemHeight);
-    EXPECT_GT(width, 0);
-    gint listX = 0, listY = 0, listWidth = 0, listHeight = 0;
-    atk_component_get_extents(ATK_COMPONENT(list), &listX, &listY, &listWidth, &listHeight, ATK_XY_SCREEN);
-    EXPECT_EQ(y, listY + 2 * CustomComboBox::kItemHeight);
+    const std::array<int, 4> place = Extents(entry, ATK_XY_SCREEN);
+    EXPECT_EQ(place[3], CustomComboBox::kItemHeight);
+    EXPECT_GT(place[2], 0);
+    EXPECT_EQ(place[1], Extents(list, ATK_XY_SCREEN)[1] + 2 * CustomComboBox::kItemHeight);
     g_object_unref(entry);
 
     combo->HidePopup();
-    ASSERT_TRUE(PumpUntil([&] { return !combo->IsPopupShown(); }));
+    ASSERT_TRUE(guitest::PumpUntil([&] { return !combo->IsPopupShown(); }));
     EXPECT_FALSE(HasState(box, ATK_STATE_EXPANDED));
     EXPECT_FALSE(HasState(list, ATK_STATE_SHOWING));
     g_object_unref(list);

@@ -6,6 +6,8 @@
 
 #include <gtest/gtest.h>
 
+#include <tuple>
+
 using namespace automation;
 
 namespace
@@ -38,36 +40,20 @@ TEST(PointerCheck, AStructureMustLieWhollyInOneAccessibleRegion)
     MemoryRegion noAccess{0x1000, 0x2000, false, false, false, false};
     MemoryRegion guard{0x2000, 0x3000, true, true, false, true};
     MemoryRegion readOnly{0x3000, 0x4000, true, false, false, false};
-    MemoryRegion writable{0x5000, 0x6000, true, true, false, false};
-    MemoryRegion writableToo{0x6000, 0x7000, true, true, false, false};
-    const RegionList memory({writableToo, noAccess, guard, readOnly, writable});
-    const struct
-    {
-        std::uintptr_t address;
-        size_t size;
-        bool readable;
-        bool writable;
-    } cases[] = {
-        {0x1800, 4, false, false},
-        {0x2800, 4, false, false},
-        {0x3000, 4, true, false},
-        {0x3ffc, 4, true, false},
-        {0x3ffd, 4, false, false},
-        {0x4800, 1, false, false},
-        {0x5000, 8, true, true},
-        // Neighbours with the same access are one region.
-        {0x5ffc, 8, true, true},
-        {0x6ff8, 9, false, false},
-        {0, 1, false, false},
-        {0x5000, 0, false, false},
-        {0x5000, SIZE_MAX, false, false},
+    MemoryRegion writableOne{0x5000, 0x6000, true, true, false, false};
+    MemoryRegion writableTwo{0x6000, 0x7000, true, true, false, false};
+    const RegionList memory({writableTwo, noAccess, guard, readOnly, writableOne});
+    // address, size, readable, writable; neighbours with the same access are one region (0x5ffc)
+    const std::tuple<std::uintptr_t, size_t, bool, bool> cases[] = {
+        {0x1800, 4, false, false}, {0x2800, 4, false, false}, {0x3000, 4, true, false},
+        {0x3ffc, 4, true, false},  {0x3ffd, 4, false, false}, {0x4800, 1, false, false},
+        {0x5000, 8, true, true},   {0x5ffc, 8, true, true},   {0x6ff8, 9, false, false},
+        {0, 1, false, false},      {0x5000, 0, false, false}, {0x5000, SIZE_MAX, false, false},
     };
-    for (const auto& c : cases)
+    for (const auto& [address, size, readable, writable] : cases)
     {
-        EXPECT_EQ(IsReadable(memory, c.address, c.size), c.readable)
-            << std::hex << c.address << "+" << c.size;
-        EXPECT_EQ(IsWritable(memory, c.address, c.size), c.writable)
-            << std::hex << c.address << "+" << c.size;
+        EXPECT_EQ(IsReadable(memory, address, size), readable) << std::hex << address << "+" << size;
+        EXPECT_EQ(IsWritable(memory, address, size), writable) << std::hex << address << "+" << size;
     }
 }
 
