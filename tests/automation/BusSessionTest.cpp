@@ -4,116 +4,65 @@
 // Python process, while another process writes the journals.
 #include <gtest/gtest.h>
 
-#include <sys/stat.h>
-
 #include <cstdio>
-#include <fstream>
 #include <sstream>
 #include <string>
 #include <vector>
 
-#include "../app/TempFolder.h"
-#include "ProgramSession.h"
+#include "ProgramSandbox.h"
 
 namespace
 {
 
-using programtest::Program;
-using programtest::XSession;
+using Row = std::vector<std::string>;
 
-struct Place
-{
-    int x = 0;
-    int y = 0;
-    int width = 0;
-    int height = 0;
-};
-
-// One table as wyx-inspect prints it.
+// One table as wyx-inspect prints it: its header line, headings, cells and
+// the screen place (x, y, width, height) of each row.
 struct Table
 {
-    std::string id;
-    std::string name;
-    int rows = -1;
-    int columns = -1;
-    std::string selected;
-    std::vector<std::string> headings;
-    std::vector<std::vector<std::string>> cells;
-    std::vector<Place> places;
+    Row table, headings;
+    std::vector<Row> cells;
+    std::vector<std::vector<int>> places;
+    std::string Selected() const { return table.size() > 5 ? table[5] : ""; }
 };
-
-std::vector<std::string> Split(const std::string& line)
-{
-    std::vector<std::string> fields;
-    std::stringstream in(line);
-    std::string field;
-    while (std::getline(in, field, '\t'))
-        fields.push_back(field);
-    if (!line.empty() && line.back() == '\t')
-        fields.emplace_back();
-    return fields;
-}
-
-std::string After(const std::string& field, const std::string& prefix)
-{
-    return field.rfind(prefix, 0) == 0 ? field.substr(prefix.size()) : std::string();
-}
 
 Table ParseTable(const std::string& text)
 {
-    Table table;
+    Table result;
     std::stringstream in(text);
-    std::string line;
-    while (std::getline(in, line))
+    for (std::string line; std::getline(in, line);)
     {
-        const std::vector<std::string> fields = Split(line);
-        if (fields.empty())
-            continue;
-        if (fields[0] == "table" && fields.size() >= 6)
-        {
-            table.id = fields[1];
-            table.name = fields[2];
-            table.rows = std::stoi(After(fields[3], "rows="));
-            table.columns = std::stoi(After(fields[4], "columns="));
-            table.selected = After(fields[5], "selected=");
-        }
-        else if (fields[0] == "heading")
-        {
-            table.headings.assign(fields.begin() + 1, fields.end());
-        }
-        else if (fields[0] == "row" && fields.size() >= 2)
-        {
-            table.cells.emplace_back(fields.begin() + 2, fields.end());
-        }
-        else if (fields[0] == "place" && fields.size() == 6)
-        {
-            table.places.push_back(Place{std::stoi(fields[2]), std::stoi(fields[3]), std::stoi(fields[4]),
-                                         std::stoi(fields[5])});
-        }
+        Row fields;
+        std::stringstream fieldsIn(line);
+        for (std::string field; std::getline(fieldsIn, field, '\t');)
+            fields.push_back(field);
+        if (!line.empty() && line.back() == '\t')
+            fields.emplace_back();
+        const std::string kind = fields.empty() ? "" : fields[0];
+        if (kind == "table")
+            result.table = fields;
+        else if (kind == "heading")
+            result.headings.assign(fields.begin() + 1, fields.end());
+        else if (kind == "row" && fields.size() >= 2)
+            result.cells.emplace_back(fields.begin() + 2, fields.end());
+        else if (kind == "place" && fields.size() == 6)
+            result.places.push_back(
+                {std::stoi(fields[2]), std::stoi(fields[3]), std::stoi(fields[4]), std::stoi(fields[5])});
     }
-    return table;
+    return result;
 }
 
-// A command's standard output and whether it succeeded.
-bool RunCommand(const std::string& command, std::string& output)
+// A shell command's standard output; a failure when it did not succeed.
+std::string RunCommand(const std::string& command)
 {
-    output.clear();
+    std::string output;
     FILE* pipe = ::popen(command.c_str(), "r");
-    if (!pipe)
-        return false;
     char buffer[4096];
-    size_t got = 0;
-    while ((got = std::fread(buffer, 1, sizeof buffer, pipe)) > 0)
+    for (size_t got = 0; pipe && (got = std::fread(buffer, 1, sizeof buffer, pipe)) > 0;)
         output.append(buffer, got);
-    return ::pclose(pipe) == 0;
-}
-
-std::string Quote(const std::string& text)
-{
-    std::string quoted = "'";
-    for (char c : text)
-        quoted += c == '\'' ? std::string("'\\''") : std::string(1, c);
-    return quoted + "'";
+    if (!pipe || ::pclose(pipe) != 0)
+        ADD_FAILURE() << command << " failed; it printed:\n" << output;
+    return output;
 }
 
 class BusSessionTest : public ::testing::Test
@@ -121,115 +70,72 @@ class BusSessionTest : public ::testing::Test
 protected:
     void SetUp() override
     {
-        ASSERT_FALSE(folder.Path().empty());
-        ASSERT_TRUE(x.IsOpen()) << "no X display: run under xvfb-run -a";
+        ASSERT_TRUE(box.Ready());
         ASSERT_NE(::getenv("DBUS_SESSION_BUS_ADDRESS"), nullptr)
             << "no session bus: run under dbus-run-session";
-        std::filesystem::create_directories(data);
-        std::ofstream(data / "TiveraJobsStatusFile.txt").flush();
-        std::ofstream(data / "TiveraJobsLogFile.txt").flush();
+        box.folder.Write("root/var/lib/Corvane/HotFolders/TiveraJobsStatusFile.txt", "");
+        box.folder.Write("root/var/lib/Corvane/HotFolders/TiveraJobsLogFile.txt", "");
     }
-
-    // As a user's session starts it: the accessibility bridge left on.
-    std::vector<std::string> Environment()
+    void TearDown() override
     {
-        const std::filesystem::path home = folder.Path() / "home";
-        std::filesystem::create_directories(home / "run");
-        ::chmod((home / "run").c_str(), 0700);
-        std::vector<std::string> environment = {
-            "HOME=" + home.string(),
-            "WYX_SYSTEM_ROOT=" + (folder.Path() / "root").string(),
-            "XDG_CONFIG_HOME=" + (home / ".config").string(),
-            "XDG_STATE_HOME=" + (home / ".local/state").string(),
-            "XDG_RUNTIME_DIR=" + (home / "run").string(),
-            "GDK_BACKEND=x11",
-            "LANG=C.UTF-8",
-        };
-        for (const char* name : {"DISPLAY", "PATH", "XAUTHORITY", "DBUS_SESSION_BUS_ADDRESS"})
-            if (const char* value = ::getenv(name))
-                environment.push_back(std::string(name) + "=" + value);
-        return environment;
+        if (program && window != 0 && !program->HasEnded())
+            box.Close(*program, window);
     }
 
     void Journal(const std::string& journal, const std::string& line)
     {
-        Program tool(WYX_JOURNAL, Environment(), std::nullopt, {journal, "add", line});
-        const int status = tool.Wait();
-        ASSERT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0) << journal << " add " << line;
+        ASSERT_EQ(box.Run(WYX_JOURNAL, {journal, "add", line}), 0) << journal << " add " << line;
     }
-
-    // The table as the tool reads it; empty when the tool failed.
-    Table Inspect(const std::string& id, int waitRows = -1)
+    void StartProgram()
     {
-        std::string command = "/usr/bin/python3 " + Quote(WYX_INSPECT) + " --places --wait 30 --pid " +
-                              std::to_string(program->Pid()) + " --only " + id;
-        if (waitRows >= 0)
-            command += " --wait-rows " + std::to_string(waitRows);
-        std::string output;
-        if (!RunCommand(command, output))
-            ADD_FAILURE() << "wyx-inspect failed; it printed:\n" << output;
-        return ParseTable(output);
+        program = std::make_unique<programtest::Program>(WYX_PROGRAM, box.environment);
+        window = box.WaitForWindow(*program);
+        ASSERT_NE(window, 0u);
     }
-
-    // Reads the table until its selection is `rows`, a bounded number of times.
-    Table InspectUntilSelected(const std::string& id, const std::string& rows)
+    // The table as the tool reads it, once it holds `rows` rows.
+    Table Inspect(const std::string& id, int rows = -1)
     {
-        Table table = Inspect(id);
-        for (int attempt = 0; attempt < 50 && table.selected != rows; ++attempt)
+        return ParseTable(RunCommand("/usr/bin/python3 '" + std::string(WYX_INSPECT) +
+                                     "' --places --wait 30 --pid " + std::to_string(program->Pid()) +
+                                     " --only " + id +
+                                     (rows >= 0 ? " --wait-rows " + std::to_string(rows) : "")));
+    }
+    // A user's click in the middle of a row's first cell; the table read
+    // until that row is its selection, a bounded number of times.
+    Table ClickRow(Table table, const std::string& id, size_t row)
+    {
+        for (int attempt = 0; attempt < 50 && (table.places.size() <= row || table.places[row][0] < 0);
+             ++attempt)
             table = Inspect(id);
+        if (table.places.size() <= row || table.places[row][0] < 0 || table.places[row][2] <= 0)
+        {
+            ADD_FAILURE() << "row " << row << " is not on the screen";
+            return table;
+        }
+        const std::vector<int>& place = table.places[row];
+        RunCommand("xdotool mousemove --sync " + std::to_string(place[0] + place[2] / 2) + " " +
+                   std::to_string(place[1] + place[3] / 2) + " click 1");
+        for (int attempt = 0; attempt < 50 && table.Selected() != "selected=" + std::to_string(row);
+             ++attempt)
+            table = Inspect(id);
+        EXPECT_FALSE(program->HasEnded());
         return table;
     }
 
-    void Xdotool(const std::string& arguments)
-    {
-        std::string output;
-        ASSERT_TRUE(RunCommand("xdotool " + arguments, output)) << "xdotool " << arguments;
-    }
-
-    // A user's click in the middle of a row's first cell.
-    void ClickRow(const Table& table, size_t row)
-    {
-        ASSERT_LT(row, table.places.size());
-        const Place& place = table.places[row];
-        ASSERT_TRUE(place.x >= 0 && place.width > 0) << "the row is not on the screen";
-        Xdotool("mousemove --sync " + std::to_string(place.x + place.width / 2) + " " +
-                std::to_string(place.y + place.height / 2) + " click 1");
-    }
-
-    void StartProgram()
-    {
-        program = std::make_unique<Program>(WYX_PROGRAM, Environment());
-        window = x.WaitForWindow(*program);
-        ASSERT_NE(window, 0u) << "no window: the program " << program->Outcome();
-    }
-
-    void TearDown() override
-    {
-        if (program && window != 0 && !program->HasEnded())
-        {
-            x.RequestClose(window);
-            const int status = program->Wait();
-            EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0) << "wait status " << status;
-        }
-    }
-
-    TempFolder folder;
-    std::filesystem::path data = folder.Path() / "root/var/lib/Corvane/HotFolders";
-    XSession x;
-    std::unique_ptr<Program> program;
+    programtest::Sandbox box{true};
+    std::unique_ptr<programtest::Program> program;
     Window window = 0;
 };
 
 TEST_F(BusSessionTest, TheStatusTableReadsAsWrittenAndShowsTheSelectedRow)
 {
-    const std::vector<std::vector<std::string>> jobs = {
+    const std::vector<Row> jobs = {
         {"41", "/srv/in/Proofs", "/srv/in/Proofs/a.pdf", "PRN-01", "1383035055", "Queued", "4096", "PDF"},
         {"42", "/srv/in/Books", "/srv/in/Books/b.ps", "PRN-02", "1383035055", "Saving...", "8192",
          "PostScript"},
         {"43", "/srv/in/Proofs", "/srv/in/Proofs/c \u00e9t\u00e9.tif", "PRN-01", "1383035055",
-         "Converting file type", "2048", "TIFF"},
-    };
-    for (const auto& job : jobs)
+         "Converting file type", "2048", "TIFF"}};
+    for (const Row& job : jobs)
     {
         std::string line;
         for (const std::string& field : job)
@@ -239,38 +145,25 @@ TEST_F(BusSessionTest, TheStatusTableReadsAsWrittenAndShowsTheSelectedRow)
     StartProgram();
 
     const Table table = Inspect("jobStatusList", 3);
-    EXPECT_EQ(table.name, "Jobs in progress");
-    ASSERT_EQ(table.rows, 3);
-    ASSERT_EQ(table.columns, 8);
-    EXPECT_EQ(table.headings, (std::vector<std::string>{"No.", "File Name", "Format", "Hot Folder", "Server",
-                                                        "Size", "Time", "Status"}));
+    EXPECT_EQ(table.table,
+              (Row{"table", "jobStatusList", "Jobs in progress", "rows=3", "columns=8", "selected=-"}));
+    EXPECT_EQ(table.headings,
+              (Row{"No.", "File Name", "Format", "Hot Folder", "Server", "Size", "Time", "Status"}));
     ASSERT_EQ(table.cells.size(), 3u);
-    // Each job's row, whatever the order: the file's title, its format, folder, server and status.
-    const struct
-    {
-        const char* title;
-        const char* folder;
-    } shown[] = {{"a", "Proofs"}, {"b", "Books"}, {"c \u00e9t\u00e9", "Proofs"}};
+    // Each job's row, whatever the order: its number, the file's title, its format, folder, server and
+    // status.
+    const char* const shown[][2] = {{"a", "Proofs"}, {"b", "Books"}, {"c \u00e9t\u00e9", "Proofs"}};
     for (size_t job = 0; job < jobs.size(); ++job)
     {
         size_t row = 0;
-        while (row < table.cells.size() &&
-               (table.cells[row].size() < 8 || table.cells[row][1] != shown[job].title))
+        while (row < 3 && (table.cells[row].size() < 8 || table.cells[row][1] != shown[job][0]))
             ++row;
-        ASSERT_LT(row, table.cells.size()) << "no row for " << shown[job].title;
-        const std::vector<std::string>& cells = table.cells[row];
-        EXPECT_EQ(cells[0], std::to_string(row + 1));
-        EXPECT_EQ(cells[2], jobs[job][7]);
-        EXPECT_EQ(cells[3], shown[job].folder);
-        EXPECT_EQ(cells[4], jobs[job][3]);
-        EXPECT_EQ(cells[7], jobs[job][5]);
+        ASSERT_LT(row, 3u) << "no row for " << shown[job][0];
+        const Row& cells = table.cells[row];
+        EXPECT_EQ((Row{cells[0], cells[2], cells[3], cells[4], cells[7]}),
+                  (Row{std::to_string(row + 1), jobs[job][7], shown[job][1], jobs[job][3], jobs[job][5]}));
     }
-    EXPECT_EQ(table.selected, "-");
-
-    ClickRow(table, 1);
-    const Table selected = InspectUntilSelected("jobStatusList", "1");
-    EXPECT_EQ(selected.selected, "1");
-    EXPECT_FALSE(program->HasEnded());
+    EXPECT_EQ(ClickRow(table, "jobStatusList", 1).Selected(), "selected=1");
 }
 
 TEST_F(BusSessionTest, TheLogTableReadsAsWrittenAndShowsTheSelectedRow)
@@ -281,32 +174,23 @@ TEST_F(BusSessionTest, TheLogTableReadsAsWrittenAndShowsTheSelectedRow)
             "8\t/srv/in/Books\t/srv/in/Books/b.ps\tPRN-02\t1383035055\tFailed\tThe server refused the job");
     StartProgram();
 
-    Table table = Inspect("jobLogList", 2);
-    EXPECT_EQ(table.name, "Finished jobs");
-    ASSERT_EQ(table.rows, 2);
-    ASSERT_EQ(table.columns, 6);
-    EXPECT_EQ(table.headings,
-              (std::vector<std::string>{" ", "File Name", "Hot Folder", "Server", "Start Time", "Status"}));
+    const Table table = Inspect("jobLogList", 2);
+    EXPECT_EQ(table.table,
+              (Row{"table", "jobLogList", "Finished jobs", "rows=2", "columns=6", "selected=-"}));
+    EXPECT_EQ(table.headings, (Row{" ", "File Name", "Hot Folder", "Server", "Start Time", "Status"}));
     ASSERT_EQ(table.cells.size(), 2u);
-    EXPECT_EQ(table.cells[0][1], "a");
-    EXPECT_EQ(table.cells[0][2], "Proofs");
-    EXPECT_EQ(table.cells[0][3], "PRN-01");
-    EXPECT_EQ(table.cells[0][5], "Transferred Successfully");
-    EXPECT_EQ(table.cells[1][1], "b");
-    EXPECT_EQ(table.cells[1][2], "Books");
-    EXPECT_EQ(table.cells[1][3], "PRN-02");
-    EXPECT_EQ(table.cells[1][5], "Failed");
+    for (const Row& cells : table.cells)
+        ASSERT_GE(cells.size(), 6u);
+    EXPECT_EQ((Row{table.cells[0][1], table.cells[0][2], table.cells[0][3], table.cells[0][5]}),
+              (Row{"a", "Proofs", "PRN-01", "Transferred Successfully"}));
+    EXPECT_EQ((Row{table.cells[1][1], table.cells[1][2], table.cells[1][3], table.cells[1][5]}),
+              (Row{"b", "Books", "PRN-02", "Failed"}));
 
     // To the Log tab as a user goes there from the keyboard; its rows come on the screen.
-    const XWindowAttributes frame = x.Attributes(window);
-    Xdotool("mousemove --sync " + std::to_string(frame.x + frame.width / 2) + " " +
-            std::to_string(frame.y + frame.height / 2) + " click 1 key ctrl+Next");
-    for (int attempt = 0; attempt < 50 && (table.places.empty() || table.places[0].x < 0); ++attempt)
-        table = Inspect("jobLogList");
-    ClickRow(table, 0);
-    const Table selected = InspectUntilSelected("jobLogList", "0");
-    EXPECT_EQ(selected.selected, "0");
-    EXPECT_FALSE(program->HasEnded());
+    const XWindowAttributes frame = box.x.Attributes(window);
+    RunCommand("xdotool mousemove --sync " + std::to_string(frame.x + frame.width / 2) + " " +
+               std::to_string(frame.y + frame.height / 2) + " click 1 key ctrl+Next");
+    EXPECT_EQ(ClickRow(table, "jobLogList", 0).Selected(), "selected=0");
 }
 
 } // namespace

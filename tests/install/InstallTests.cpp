@@ -1,108 +1,87 @@
 // The program where an install puts it: cmake --install into a temporary
 // prefix, and the Debian package unpacked into a temporary folder. Each copy
-// must start from there with its own libraries, files and catalogs.
+// must start from there with its own libraries, files and catalogs. Also the
+// second launch, as from the menu while the window is open behind others.
 #include <gtest/gtest.h>
 
-#include <fstream>
 #include <string>
 #include <vector>
 
-#include "InstalledProgram.h"
+#include "ProgramSandbox.h"
 
 namespace
 {
 
-using installtest::Environment;
-using installtest::FindOnPath;
-using installtest::RunToEnd;
 using programtest::Program;
-using programtest::XSession;
 
 const std::string kProgramName = std::filesystem::path(WYX_PROGRAM).filename().string();
 
 class InstalledTest : public ::testing::Test
 {
 protected:
-    void SetUp() override
-    {
-        ASSERT_FALSE(folder.Path().empty());
-        ASSERT_TRUE(x.IsOpen()) << "no X display: run the tests under xvfb-run -a";
-        environment = Environment(folder.Path());
-    }
+    void SetUp() override { ASSERT_TRUE(box.Ready()); }
 
-    // Starts the program at bin (in German, so that the title shows the
-    // shipped catalogs were found), checks its window and closes it.
-    void ExpectWindowOpens(const std::filesystem::path& program)
+    // Starts the program in German (the title shows the shipped catalogs were
+    // found); wyx-journal writes and reads a journal below the system root and
+    // the simulator answers --help. A tool exits 127 when a library is missing.
+    void ExpectProgramsRun(const std::filesystem::path& bin)
     {
-        folder.Write("home/.config/Corvane Quillet/current.lang", "de_DE\n");
-        Program copy(program.string(), environment);
-        const Window window = x.WaitForWindow(copy);
-        ASSERT_NE(window, 0u) << "no window: " << program << " " << copy.Outcome();
-        EXPECT_EQ(x.Title(window), "Kelvo Duv Ureruve - Status & Protokoll");
-        x.RequestClose(window);
-        const int status = copy.Wait();
-        EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0) << copy.Outcome();
-    }
-
-    // wyx-journal writes and reads a journal below the system root; the
-    // simulator answers --help. Both exit 127 when a library is not found.
-    void ExpectToolsRun(const std::filesystem::path& bin)
-    {
-        folder.Write("root/var/lib/Corvane/HotFolders/TiveraJobsStatusFile.txt", "");
-        std::filesystem::create_directories(folder.Path() / "root/dev/shm");
+        box.folder.Write("home/.config/Corvane Quillet/current.lang", "de_DE\n");
+        Program copy((bin / kProgramName).string(), box.environment);
+        if (const Window window = box.WaitForWindow(copy))
+        {
+            EXPECT_EQ(box.x.Title(window), "Kelvo Duv Ureruve - Status & Protokoll");
+            box.Close(copy, window);
+        }
+        box.folder.Write("root/var/lib/Corvane/HotFolders/TiveraJobsStatusFile.txt", "");
+        std::filesystem::create_directories(box.folder.Path() / "root/dev/shm");
         const std::string journal = (bin / "wyx-journal").string();
-        EXPECT_EQ(
-            RunToEnd(journal,
-                     {"status", "add", "7\t/srv/in\t/srv/in/a.pdf\tPRN-01\t1383035055\tSaving...\t4096\tPDF"},
-                     environment),
-            0);
-        EXPECT_EQ(RunToEnd(journal, {"status", "read"}, environment), 0);
-        EXPECT_EQ(RunToEnd((bin / "wyx-simulator").string(), {"--help"}, environment), 0);
+        EXPECT_EQ(box.Run(journal, {"status", "add",
+                                    "7\t/srv/in\t/srv/in/a.pdf\tPRN-01\t1383035055\tSaving...\t4096\tPDF"}),
+                  0);
+        EXPECT_EQ(box.Run(journal, {"status", "read"}), 0);
+        EXPECT_EQ(box.Run((bin / "wyx-simulator").string(), {"--help"}), 0);
     }
 
-    TempFolder folder;
-    XSession x;
-    std::vector<std::string> environment;
+    programtest::Sandbox box;
 };
 
 TEST_F(InstalledTest, AnInstallToAnyPrefixRunsWithoutALibraryPath)
 {
-    const std::filesystem::path prefix = folder.Path() / "prefix with space";
-    ASSERT_EQ(RunToEnd(WYX_CMAKE, {"--install", WYX_BUILD_DIR, "--prefix", prefix.string()}, environment), 0);
-
-    for (const char* file :
-         {"bin/wyx-journal", "bin/wyx-simulator", "bin/wyx-inspect", "share/wyxprogress/WyxConfig.cfg",
-          "share/wyxprogress/wyx_folder.ico", "share/wyxprogress/LocalizedStrings/de_DE/wyx3.mo",
-          "share/applications/wyxprogress.desktop", "share/icons/hicolor/scalable/apps/wyxprogress.svg"})
+    const std::filesystem::path prefix = box.folder.Path() / "prefix with space";
+    ASSERT_EQ(box.Run(WYX_CMAKE, {"--install", WYX_BUILD_DIR, "--prefix", prefix.string()}), 0);
+    std::vector<std::string> files = {"bin/wyx-journal",
+                                      "bin/wyx-simulator",
+                                      "bin/wyx-inspect",
+                                      "share/wyxprogress/WyxConfig.cfg",
+                                      "share/wyxprogress/wyx_folder.ico",
+                                      "share/wyxprogress/LocalizedStrings/de_DE/wyx3.mo",
+                                      "share/applications/wyxprogress.desktop",
+                                      "share/icons/hicolor/scalable/apps/wyxprogress.svg"};
+    for (const char* size : {"16", "32", "48", "64", "128", "256"})
+        files.push_back(std::string("share/icons/hicolor/") + size + "x" + size + "/apps/wyxprogress.png");
+    for (const std::string& file : files)
         EXPECT_TRUE(std::filesystem::is_regular_file(prefix / file)) << file;
-    for (int size : {16, 32, 48, 64, 128, 256})
-    {
-        const std::string size_ = std::to_string(size);
-        EXPECT_TRUE(std::filesystem::is_regular_file(prefix / "share/icons/hicolor" / (size_ + "x" + size_) /
-                                                     "apps/wyxprogress.png"))
-            << size;
-    }
     // Every library the build made is installed beside the others.
     for (const auto& entry :
          std::filesystem::directory_iterator(std::filesystem::path(WYX_PROGRAM).parent_path()))
-        if (entry.path().extension() == ".so" && entry.path().filename().string().rfind("lib", 0) == 0)
-            EXPECT_TRUE(std::filesystem::exists(prefix / "lib/wyxprogress" / entry.path().filename()))
-                << entry.path().filename();
-
-    ExpectWindowOpens(prefix / "bin" / kProgramName);
-    ExpectToolsRun(prefix / "bin");
+    {
+        const std::string name = entry.path().filename().string();
+        EXPECT_TRUE(entry.path().extension() != ".so" || name.rfind("lib", 0) != 0 ||
+                    std::filesystem::exists(prefix / "lib/wyxprogress" / name))
+            << name;
+    }
+    ExpectProgramsRun(prefix / "bin");
 }
 
 TEST_F(InstalledTest, TheDebianPackageRunsWhereItIsUnpacked)
 {
-    const std::string dpkgDeb = FindOnPath("dpkg-deb");
-    if (dpkgDeb.empty())
+    const std::string dpkgDeb = "/usr/bin/dpkg-deb";
+    if (!std::filesystem::exists(dpkgDeb))
         GTEST_SKIP() << "dpkg-deb is not installed: the Debian package cannot be unpacked here";
-    const std::filesystem::path packages = folder.Path() / "packages";
-    ASSERT_EQ(RunToEnd(WYX_CPACK,
-                       {"--config", std::string(WYX_BUILD_DIR) + "/CPackConfig.cmake", "-G", "DEB", "-B",
-                        packages.string()},
-                       environment),
+    const std::filesystem::path packages = box.folder.Path() / "packages";
+    ASSERT_EQ(box.Run(WYX_CPACK, {"--config", std::string(WYX_BUILD_DIR) + "/CPackConfig.cmake", "-G", "DEB",
+                                  "-B", packages.string()}),
               0);
     std::filesystem::path package;
     for (const auto& entry : std::filesystem::directory_iterator(packages))
@@ -111,16 +90,68 @@ TEST_F(InstalledTest, TheDebianPackageRunsWhereItIsUnpacked)
     ASSERT_FALSE(package.empty()) << "cpack made no .deb in " << packages;
     EXPECT_EQ(package.filename().string().rfind("wyxprogress_", 0), 0u) << package;
 
-    const std::filesystem::path unpacked = folder.Path() / "unpacked";
-    ASSERT_EQ(RunToEnd(dpkgDeb, {"-x", package.string(), unpacked.string()}, environment), 0);
+    const std::filesystem::path unpacked = box.folder.Path() / "unpacked";
+    ASSERT_EQ(box.Run(dpkgDeb, {"-x", package.string(), unpacked.string()}), 0);
     for (const char* file :
          {"usr/share/applications/wyxprogress.desktop",
           "usr/share/icons/hicolor/256x256/apps/wyxprogress.png", "usr/share/wyxprogress/WyxConfig.cfg",
           "usr/lib/wyxprogress/libwyx_os.so", "usr/share/doc/wyxprogress/copyright"})
         EXPECT_TRUE(std::filesystem::is_regular_file(unpacked / file)) << file;
+    ExpectProgramsRun(unpacked / "usr/bin");
+}
 
-    ExpectWindowOpens(unpacked / "usr/bin" / kProgramName);
-    ExpectToolsRun(unpacked / "usr/bin");
+// The window that has the keyboard focus, as the top-level child of the root
+// window it belongs to (or PointerRoot / None).
+Window FocusedTopLevel(Display* display)
+{
+    Window focus = 0, root = DefaultRootWindow(display), rootOfTree = 0, parent = 0;
+    int revert = 0;
+    XGetInputFocus(display, &focus, &revert);
+    for (; focus != 0 && focus != PointerRoot && focus != root; focus = parent)
+    {
+        Window* children = nullptr;
+        unsigned int count = 0;
+        if (!XQueryTree(display, focus, &rootOfTree, &parent, &children, &count))
+            return 0;
+        if (children != nullptr)
+            XFree(children);
+        if (parent == root)
+            return focus;
+    }
+    return focus;
+}
+
+// The first copy's window comes to the front and takes the keyboard focus;
+// the second copy ends without a window of its own.
+TEST_F(InstalledTest, ASecondLaunchBringsTheFirstWindowToTheFrontAndEnds)
+{
+    Display* display = XOpenDisplay(nullptr);
+    ASSERT_NE(display, nullptr);
+    Program first(WYX_PROGRAM, box.environment);
+    const Window window = box.WaitForWindow(first);
+    ASSERT_NE(window, 0u);
+    // The user works elsewhere: the window no longer has the focus.
+    XSetInputFocus(display, PointerRoot, RevertToPointerRoot, CurrentTime);
+    XSync(display, False);
+    ASSERT_NE(FocusedTopLevel(display), window);
+
+    Program second(WYX_PROGRAM, box.environment);
+    EXPECT_EQ(box.x.WaitForWindow(second), 0u) << "the second copy opened a window";
+    EXPECT_TRUE(WIFEXITED(second.Wait())) << second.Outcome();
+
+    // The knock is handled on the first copy's main loop: wait until its
+    // window has the focus (or the first copy ended, which fails below).
+    XSelectInput(display, window, FocusChangeMask);
+    while (FocusedTopLevel(display) != window && !first.HasEnded())
+    {
+        pollfd connection{ConnectionNumber(display), POLLIN, 0};
+        ::poll(&connection, 1, 100); // only lets the loop notice a program that ended
+        for (XEvent event; XPending(display) > 0;)
+            XNextEvent(display, &event);
+    }
+    EXPECT_EQ(FocusedTopLevel(display), window) << "the first copy " << first.Outcome();
+    XCloseDisplay(display);
+    box.Close(first, window);
 }
 
 } // namespace

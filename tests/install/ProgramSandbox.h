@@ -1,0 +1,83 @@
+#pragma once
+
+// A program started as a user starts it, in a folder of its own: a private
+// system root, home and runtime folder, an environment without the build's
+// library folder in it, and the display its window goes to. Shared by the
+// install, language and accessibility-bus process tests.
+// Include after GoogleTest (see ProgramSession.h).
+#include <sys/stat.h>
+
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include "ProgramSession.h"
+#include "TempFolder.h"
+
+namespace programtest
+{
+
+class Sandbox
+{
+public:
+    // accessibility: the bridge left on and the session bus passed, as a desktop session starts programs.
+    explicit Sandbox(bool accessibility = false)
+    {
+        const std::filesystem::path home = folder.Path() / "home";
+        std::filesystem::create_directories(home / "run");
+        ::chmod((home / "run").c_str(), 0700);
+        environment = {"HOME=" + home.string(),
+                       "WYX_SYSTEM_ROOT=" + (folder.Path() / "root").string(),
+                       "XDG_CONFIG_HOME=" + (home / ".config").string(),
+                       "XDG_STATE_HOME=" + (home / ".local/state").string(),
+                       "XDG_RUNTIME_DIR=" + (home / "run").string(),
+                       "GDK_BACKEND=x11",
+                       "LANG=C.UTF-8"};
+        if (!accessibility)
+            environment.push_back("NO_AT_BRIDGE=1");
+        for (const char* name :
+             {"DISPLAY", "PATH", "XAUTHORITY", accessibility ? "DBUS_SESSION_BUS_ADDRESS" : ""})
+            if (const char* value = *name ? ::getenv(name) : nullptr)
+                environment.push_back(std::string(name) + "=" + value);
+    }
+
+    // Whether the folder and the display are there; a failure says what is missing.
+    ::testing::AssertionResult Ready() const
+    {
+        if (folder.Path().empty())
+            return ::testing::AssertionFailure() << "no temporary folder";
+        if (!x.IsOpen())
+            return ::testing::AssertionFailure() << "no X display: run the tests under xvfb-run -a";
+        return ::testing::AssertionSuccess();
+    }
+
+    // Runs a program to its end; its exit code, or -1 when it did not exit.
+    int Run(const std::string& program, const std::vector<std::string>& arguments) const
+    {
+        Program process(program, environment, std::nullopt, arguments);
+        const int status = process.Wait();
+        return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+    }
+
+    // The program's window once it is mapped; 0, with a failure, when the program ended first.
+    Window WaitForWindow(Program& program)
+    {
+        const Window window = x.WaitForWindow(program);
+        EXPECT_NE(window, 0u) << "no window: the program " << program.Outcome();
+        return window;
+    }
+
+    // Closes the window as the user does; the program must end with exit code 0.
+    void Close(Program& program, Window window)
+    {
+        x.RequestClose(window);
+        const int status = program.Wait();
+        EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0) << program.Outcome();
+    }
+
+    TempFolder folder;
+    XSession x;
+    std::vector<std::string> environment;
+};
+
+} // namespace programtest
