@@ -17,18 +17,10 @@
 #include <wx/statusbr.h>
 #include <wx/translation.h>
 
-#include <functional>
 #include <vector>
 
 namespace
 {
-
-bool PumpUntil(const std::function<bool()>& condition)
-{
-    for (int round = 0; round < 300 && !condition(); ++round)
-        guitest::Pump(10);
-    return condition();
-}
 
 template <typename List> std::vector<wxString> Headings(const List* list)
 {
@@ -66,7 +58,7 @@ protected:
         frame = new CMainFrame(_("Kelvo Duv Ureruve") + " - " + _("Status & Log"), wxDefaultPosition,
                                wxSize(800, 600));
         frame->Show();
-        ASSERT_TRUE(PumpUntil([this] { return frame->GetNotebook()->GetPageCount() == 2; }));
+        ASSERT_TRUE(guitest::PumpUntil([this] { return frame->GetNotebook()->GetPageCount() == 2; }));
     }
     void TearDown() override
     {
@@ -84,7 +76,7 @@ protected:
     CMainFrame* frame = nullptr;
 };
 
-TEST_F(GermanWindowTest, TitleTabsAndHeadingsAreGerman)
+TEST_F(GermanWindowTest, TitleTabsHeadingsRowsAndFootersAreGerman)
 {
     EXPECT_EQ(frame->GetTitle(), "Kelvo Duv Ureruve - Status & Protokoll");
     EXPECT_EQ(frame->GetNotebook()->GetPageText(0), "Status");
@@ -94,16 +86,13 @@ TEST_F(GermanWindowTest, TitleTabsAndHeadingsAreGerman)
     EXPECT_EQ(Headings(Log()->GetLogList()),
               Texts({" ", "Dateiname", "Hotfolder", "Server", "Startzeit", "Status"}));
     EXPECT_EQ(Status()->GetFooter()->GetStatusText(0), "0 Elemente ");
-}
 
-TEST_F(GermanWindowTest, ALoggedJobAndTheSelectionFooterAreGerman)
-{
     logtest::SystemRoot::AppendFile(
         root.JournalPath(), logtest::LogLine("Prospekt", "ADDED", "Transferred Successfully", folders[0]) +
                                 logtest::LogLine("Plakat", "ADDED", "Transfer failed", folders[0]));
     JobLogManager::GetInstance().Refresh();
     ProfilesKelvoProfilesListCtrl* list = Log()->GetLogList();
-    ASSERT_TRUE(PumpUntil([list] { return list->GetItemCount() == 2; }));
+    ASSERT_TRUE(guitest::PumpUntil([list] { return list->GetItemCount() == 2; }));
 
     std::vector<wxString> statuses;
     for (long row = 0; row < list->GetItemCount(); ++row)
@@ -112,7 +101,8 @@ TEST_F(GermanWindowTest, ALoggedJobAndTheSelectionFooterAreGerman)
     EXPECT_EQ(statuses, Texts({"Erfolgreich übertragen", "Übertragungsfehler"}));
 
     list->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-    ASSERT_TRUE(PumpUntil([this] { return Log()->GetFooter()->GetStatusText(0).Contains("ausgew"); }));
+    ASSERT_TRUE(
+        guitest::PumpUntil([this] { return Log()->GetFooter()->GetStatusText(0).Contains("ausgew"); }));
     EXPECT_EQ(Log()->GetFooter()->GetStatusText(0), wxString::FromUTF8("1 von 2 Elementen ausgewählt."));
 }
 
