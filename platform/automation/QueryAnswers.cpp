@@ -227,24 +227,28 @@ Answer GetItemQuery(const AutomationSource& source, std::intptr_t lParam, const 
     return 1;
 }
 
-Answer GetColumnQuery(const AutomationSource& source, std::uintptr_t column, std::intptr_t lParam,
-                      const MemoryRegions& memory)
+// A column's heading, width and format into a caller's LVCOLUMNW or HDITEMW:
+// the list and its header answer the same from the same column, each in its
+// own structure and mask bits. Only the fields asked for are reported back.
+template <class Item, std::int32_t Item::*Width>
+Answer ColumnItemQuery(const AutomationSource& source, std::uintptr_t column, std::intptr_t lParam,
+                       const MemoryRegions& memory, unsigned textBit, unsigned widthBit, unsigned formatBit)
 {
-    LVCOLUMNW out{};
+    Item out{};
     ColumnInfo info;
     if (column >= static_cast<std::uintptr_t>(std::max(0, source.ColumnCount())) ||
         !ReadForWriting(memory, lParam, out) || !source.Column(static_cast<int>(column), info))
         return kDefault;
     const TextCopy copy(info.heading, out.cchTextMax);
-    if ((out.mask & kLvcfText) && !copy.Fits(memory, out.pszText))
+    if ((out.mask & textBit) && !copy.Fits(memory, out.pszText))
         return kDefault;
-    if (out.mask & kLvcfText)
+    if (out.mask & textBit)
         copy.Put(out.pszText);
-    if (out.mask & kLvcfWidth)
-        out.cx = info.width;
-    if (out.mask & kLvcfFmt)
+    if (out.mask & widthBit)
+        out.*Width = info.width;
+    if (out.mask & formatBit)
         out.fmt = NativeFormat(info.alignment);
-    out.mask &= kLvcfText | kLvcfWidth | kLvcfFmt;
+    out.mask &= textBit | widthBit | formatBit;
     WriteBack(lParam, out);
     return 1;
 }
@@ -294,7 +298,8 @@ Answer ListQuery(const AutomationSource& source, unsigned message, std::uintptr_
     case kLvmZeroQuery:
         return 0;
     case kLvmGetColumnW:
-        return GetColumnQuery(source, wParam, lParam, memory);
+        return ColumnItemQuery<LVCOLUMNW, &LVCOLUMNW::cx>(source, wParam, lParam, memory, kLvcfText,
+                                                          kLvcfWidth, kLvcfFmt);
     case kHdmGetItemCount:
         return source.ColumnCount();
     default:
@@ -325,29 +330,6 @@ Answer HeaderItemRect(const AutomationSource& source, std::uintptr_t column, std
     return 1;
 }
 
-Answer HeaderGetItem(const AutomationSource& source, std::uintptr_t column, std::intptr_t lParam,
-                     const MemoryRegions& memory)
-{
-    HDITEMW out{};
-    ColumnInfo info;
-    if (column >= static_cast<std::uintptr_t>(std::max(0, source.ColumnCount())) ||
-        !ReadForWriting(memory, lParam, out) || !source.Column(static_cast<int>(column), info))
-        return kDefault;
-    const TextCopy copy(info.heading, out.cchTextMax);
-    if ((out.mask & kHdiText) && !copy.Fits(memory, out.pszText))
-        return kDefault;
-    if (out.mask & kHdiText)
-        copy.Put(out.pszText);
-    if (out.mask & kHdiWidth)
-        out.cxy = info.width;
-    if (out.mask & kHdiFormat)
-        out.fmt = NativeFormat(info.alignment);
-    // The image is looked up but not handed out.
-    out.mask &= kHdiText | kHdiWidth | kHdiFormat;
-    WriteBack(lParam, out);
-    return 1;
-}
-
 Answer HeaderQuery(const AutomationSource& source, unsigned message, std::uintptr_t wParam,
                    std::intptr_t lParam, const MemoryRegions& memory)
 {
@@ -358,7 +340,9 @@ Answer HeaderQuery(const AutomationSource& source, unsigned message, std::uintpt
     case kHdmGetItemRect:
         return HeaderItemRect(source, wParam, lParam, memory);
     case kHdmGetItemW:
-        return HeaderGetItem(source, wParam, lParam, memory);
+        // The image is looked up but not handed out.
+        return ColumnItemQuery<HDITEMW, &HDITEMW::cxy>(source, wParam, lParam, memory, kHdiText, kHdiWidth,
+                                                       kHdiFormat);
     default:
         return kDefault;
     }
