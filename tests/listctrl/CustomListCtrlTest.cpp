@@ -3,6 +3,8 @@
 
 #include "components/Utility/CustomListCtrl.h"
 
+#include <sstream>
+
 using namespace listtest;
 
 namespace
@@ -48,40 +50,29 @@ TEST_F(ListJobTable, ColumnsShowTheRowNumberAndTheirFieldsAndNothingOutside)
     EXPECT_EQ(table->GetItemText(2, 1), wxS("c"));
 }
 
-struct StatusImageCase
-{
-    const char* status;
-    long column;
-    int expected; // with status image 5
-};
-
-class ListJobTableImage : public ListJobTable, public ::testing::WithParamInterface<StatusImageCase>
-{
-};
-
-TEST_P(ListJobTableImage, OnlyRowsInProgressShowTheStatusImage)
+TEST_F(ListJobTable, OnlyRowsInProgressShowTheStatusImageInTheStatusColumn)
 {
     CustomListCtrl* table = MakeTable();
-    table->SetRecords({Row(wxS("job"), wxString::FromUTF8(GetParam().status))});
     table->SetItemCount(1);
     table->SetStatusImage(5);
-    wxListItem info;
-    info.SetId(0);
-    info.SetColumn(GetParam().column);
-    info.SetMask(wxLIST_MASK_TEXT | wxLIST_MASK_IMAGE);
-    ASSERT_TRUE(table->GetItem(info));
-    EXPECT_EQ(info.GetImage(), GetParam().expected);
-    if (GetParam().column == 7)
-        EXPECT_EQ(info.GetText(), wxString::FromUTF8(GetParam().status));
+    // "status:column=image;"
+    std::istringstream cases(
+        "Converting file type:7=5;Transferring to server:7=5;Saving...:7=5;saving...:7=-1;"
+        "Saving... :7=-1;Transferred Successfully:7=-1;Saving...:6=-1;Saving...:0=-1;");
+    for (std::string status, column, image; std::getline(cases, status, ':') &&
+                                            std::getline(cases, column, '=') &&
+                                            std::getline(cases, image, ';');)
+    {
+        table->SetRecords({Row(wxS("job"), status)});
+        wxListItem info;
+        info.SetId(0);
+        info.SetColumn(std::stoi(column));
+        info.SetMask(wxLIST_MASK_TEXT | wxLIST_MASK_IMAGE);
+        ASSERT_TRUE(table->GetItem(info));
+        EXPECT_EQ(info.GetImage(), std::stoi(image)) << status << " in " << column;
+        EXPECT_EQ(info.GetText(), column == "7" ? wxString(status) : info.GetText());
+    }
 }
-
-INSTANTIATE_TEST_SUITE_P(
-    ListJobStatuses, ListJobTableImage,
-    ::testing::Values(StatusImageCase{"Converting file type", 7, 5},
-                      StatusImageCase{"Transferring to server", 7, 5}, StatusImageCase{"Saving...", 7, 5},
-                      StatusImageCase{"saving...", 7, -1}, StatusImageCase{"Saving... ", 7, -1},
-                      StatusImageCase{"Transferred Successfully", 7, -1}, StatusImageCase{"Saving...", 6, -1},
-                      StatusImageCase{"Saving...", 0, -1}));
 
 TEST_F(ListJobTable, RowsOfAStaleCountGiveNothingAndPaint)
 {

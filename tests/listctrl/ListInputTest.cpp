@@ -16,8 +16,8 @@ namespace
 // A script of steps "action|events|state;": an action of the user or the
 // program (see Do), the list events it sends ("*": not checked), and the state
 // after it: the selected rows in order, unless "#n" gives their number; "@i" the
-// focused row, "^i" the top row ("^$": the last page). A row may count pages:
-// "2p-1" is two pages less one row.
+// focused row, "^i" the top row ("^$": the last page), "gx" the column resize
+// guide, "c1=w" the width of column 1.
 class ListInput : public ListFixture
 {
 protected:
@@ -28,13 +28,19 @@ protected:
         m_events = std::make_unique<EventLog>(m_list);
     }
 
+    // A row or x: "2p-1" is two pages less one row, "m+100" the header's minimum
+    // column width and 100, "w-10" ten pixels left of the header's right edge.
     long Item(const std::string& text) const
     {
-        const size_t p = text.find('p');
-        if (p == std::string::npos)
+        const size_t at = text.find_first_of("pmw");
+        if (at == std::string::npos)
             return std::stol(text);
-        const long pages = p == 0 ? 1 : std::stol(text.substr(0, p));
-        return pages * m_rows->GetCountPerPage() + (p + 1 < text.size() ? std::stol(text.substr(p + 1)) : 0);
+        const ProfilesKelvoListHeaderWindow* header = m_list->GetHeaderWindow();
+        const long unit = text[at] == 'p'   ? m_rows->GetCountPerPage()
+                          : text[at] == 'm' ? header->GetMinimumColumnWidth()
+                                            : header->GetClientSize().GetWidth();
+        return (at == 0 ? 1 : std::stol(text.substr(0, at))) * unit +
+               (at + 1 < text.size() ? std::stol(text.substr(at + 1)) : 0);
     }
 
     // "click c+s+3" (with Ctrl and Shift), "rclick 3", "dclick 3", "key c+a", "scroll pagedown",
@@ -46,19 +52,20 @@ protected:
         in >> verb >> arg;
         const bool ctrl = arg.find("c+") != std::string::npos;
         const bool shift = arg.find("s+") != std::string::npos;
-        arg = arg.substr(arg.rfind('+') + 1);
+        arg = arg.substr(ctrl * 2 + shift * 2);
         const std::string names =
             " down up pgdn pgup home end space enter a click rclick dclick top bottom lineup "
-            "linedown pageup pagedown ";
+            "linedown pageup pagedown hclick hrclick hdrag hup ";
         const int keys[] = {WXK_DOWN, WXK_UP,    WXK_PAGEDOWN, WXK_PAGEUP, WXK_HOME,
                             WXK_END,  WXK_SPACE, WXK_RETURN,   'A'};
         const int events[] = {wxEVT_LEFT_DOWN,          wxEVT_RIGHT_DOWN,       wxEVT_LEFT_DCLICK,
                               wxEVT_SCROLLWIN_TOP,      wxEVT_SCROLLWIN_BOTTOM, wxEVT_SCROLLWIN_LINEUP,
                               wxEVT_SCROLLWIN_LINEDOWN, wxEVT_SCROLLWIN_PAGEUP, wxEVT_SCROLLWIN_PAGEDOWN};
+        const int header[] = {wxEVT_LEFT_DOWN, wxEVT_RIGHT_UP, wxEVT_MOTION, wxEVT_LEFT_UP};
         const auto code = [&](const std::string& name)
         {
             const auto at = std::count(names.begin(), names.begin() + names.find(" " + name + " "), ' ');
-            return at < 9 ? keys[at] : events[at - 9];
+            return at < 9 ? keys[at] : at < 18 ? events[at - 9] : header[at - 18];
         };
         const long all = wxLIST_STATE_SELECTED | wxLIST_STATE_FOCUSED;
         m_rows->LayoutIfNeeded();
@@ -69,7 +76,10 @@ protected:
         wheel.m_wheelDelta = 120;
         wheel.m_linesPerAction = 3;
         wxScrollWinEvent scroll(verb == "scroll" ? code(arg) : 0, 0, wxVERTICAL);
-        if (verb.find("click") != std::string::npos)
+        if (verb[0] == 'h')
+            SendMouse(m_list->GetHeaderWindow(), code(verb), static_cast<int>(item), 10, false, false,
+                      verb == "hdrag");
+        else if (verb.find("click") != std::string::npos)
             SendMouse(m_rows, code(verb), 50, int((item - m_rows->GetTopItem()) * lh + lh / 2), ctrl, shift);
         else if (verb == "key")
             SendKey(m_rows, code(arg), ctrl, shift);
@@ -112,6 +122,10 @@ protected:
                     EXPECT_EQ(m_rows->GetTopItem() + m_rows->GetCountPerPage(), m_list->GetItemCount());
                 else if (token[0] == '^')
                     EXPECT_EQ(m_rows->GetTopItem(), Item(rest));
+                else if (token[0] == 'g')
+                    EXPECT_EQ(m_rows->GetResizeGuide(), Item(rest));
+                else if (token[0] == 'c')
+                    EXPECT_EQ(m_list->GetColumnWidth(token[1] - '0'), Item(token.substr(3)));
                 else
                     selected += (selected.empty() ? "" : " ") + std::to_string(Item(token));
             }
@@ -235,20 +249,9 @@ TEST_F(ListInput, ItemsBeyondTheCountAreLeftAlone)
 TEST_F(ListInput, HeaderClicksReportTheColumnOrMinusTwoNearTheRightEdge)
 {
     Build(0, 3);
-    ProfilesKelvoListHeaderWindow* header = m_list->GetHeaderWindow();
-    const int width = header->GetClientSize().GetWidth();
-    ASSERT_GT(width, 300);
-    // x from the left, or from the right edge when negative or "-0"; right-button releases report X.
-    const std::tuple<bool, int, bool, const char*> cases[] = {
-        {false, 50, false, "C0"}, {false, 150, false, "C1"}, {false, 150, true, "X1"},
-        {false, 250, false, ""},  {true, 10, false, "C-2"},  {true, 1, false, "C-2"},
-        {true, 19, false, "C-2"}, {true, 20, false, ""},     {true, 0, false, ""},
-        {true, 5, true, "X-2"}};
-    for (const auto& [fromRight, x, right, expected] : cases)
-    {
-        SendMouse(header, right ? wxEVT_RIGHT_UP : wxEVT_LEFT_DOWN, fromRight ? width - x : x, 10);
-        EXPECT_EQ(m_events->Take(), expected) << (fromRight ? "from the right " : "") << x;
-    }
+    ASSERT_GT(m_list->GetHeaderWindow()->GetClientSize().GetWidth(), 300);
+    Run("hclick 50|C0|; hclick 150|C1|; hrclick 150|X1|; hclick 250||; hclick w-10|C-2|; hclick w-1|C-2|;"
+        "hclick w-19|C-2|; hclick w-20||; hclick w||; hrclick w-5|X-2|;");
 }
 
 TEST_F(ListInput, DraggingABorderResizesTheColumnDownToItsMinimumUnlessVetoed)
@@ -258,30 +261,13 @@ TEST_F(ListInput, DraggingABorderResizesTheColumnDownToItsMinimumUnlessVetoed)
     marks.Add(wxBitmap(wxImage(16, 16)));
     m_list->SetImageList(&marks, kHeaderImageList);
     ProfilesKelvoListHeaderWindow* header = m_list->GetHeaderWindow();
-    const int minimum = header->GetTextExtent(wxS("M")).GetWidth() + 8 + 16 + 5;
-    EXPECT_EQ(header->GetMinimumColumnWidth(), minimum);
-    SendMouse(header, wxEVT_LEFT_DOWN, 100, 10);
-    ASSERT_TRUE(header->IsResizing());
-    SendMouse(header, wxEVT_MOTION, 150, 10, false, false, true);
-    EXPECT_EQ(m_rows->GetResizeGuide(), 150 - 1) << "the guide follows the border";
-    SendMouse(header, wxEVT_MOTION, 3, 10, false, false, true);
-    EXPECT_EQ(m_rows->GetResizeGuide(), minimum - 1) << "the guide stops at the minimum";
-    SendMouse(header, wxEVT_LEFT_UP, 3, 10);
-    EXPECT_FALSE(header->IsResizing());
-    EXPECT_EQ(m_rows->GetResizeGuide(), -1);
-    EXPECT_EQ(m_list->GetColumnWidth(0), minimum);
-    EXPECT_EQ(m_events->Take(), "B0 G0 G0 E0");
-    // The second column's border moved with the first column's width.
-    SendMouse(header, wxEVT_LEFT_DOWN, minimum + 100, 10);
-    SendMouse(header, wxEVT_LEFT_UP, minimum + 140, 10);
-    EXPECT_EQ(m_list->GetColumnWidth(1), 140);
-    m_list->SetImageList(nullptr, kHeaderImageList);
-
+    EXPECT_EQ(header->GetMinimumColumnWidth(), header->GetTextExtent(wxS("M")).GetWidth() + 8 + 16 + 5);
+    // The guide follows the border down to the minimum; the second border moved with the first.
+    Run("hclick 100|B0|g99; hdrag 150|G0|g149; hdrag 3|G0|gm-1; hup 3|E0|g-1 c0=m;"
+        "hclick m+100|B1|; hup m+140|E1|c1=140;");
     m_list->Bind(wxEVT_LIST_COL_BEGIN_DRAG, [](wxListEvent& event) { event.Veto(); });
-    SendMouse(header, wxEVT_LEFT_DOWN, minimum, 10);
-    EXPECT_FALSE(header->IsResizing());
-    SendMouse(header, wxEVT_LEFT_UP, minimum + 60, 10);
-    EXPECT_EQ(m_list->GetColumnWidth(0), minimum);
+    Run("hclick m|*|g-1; hup m+60||c0=m;");
+    m_list->SetImageList(nullptr, kHeaderImageList);
 
     m_list->InsertItem(0, wxS("a considerably longer cell text"));
     ASSERT_TRUE(m_list->SetColumnWidth(0, wxLIST_AUTOSIZE));
