@@ -288,7 +288,7 @@ TEST_F(LogModel, LinesReadBeforeAClearDoNotComeBack)
 
 TEST_F(LogModel, ClearLogBesideAnAppendingProducerKeepsEveryLaterLineAndNoEarlierOne)
 {
-    constexpr int kJobs = 200;
+    constexpr int kJobs = 80;
     Write("");
     ASSERT_EQ(0, m_model.Parse());
 
