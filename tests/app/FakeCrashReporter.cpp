@@ -10,9 +10,7 @@ namespace
 void Record(const char* entry)
 {
     const char* path = std::getenv("WYX_TEST_CRASH_LOG");
-    if (path == nullptr)
-        return;
-    if (FILE* log = std::fopen(path, "a"))
+    if (FILE* log = path ? std::fopen(path, "a") : nullptr)
     {
         std::fprintf(log, "%s\n", entry);
         std::fclose(log);

@@ -4,6 +4,7 @@
 
 #include <filesystem>
 #include <fstream>
+#include <optional>
 #include <string>
 
 // A fresh folder under the system's temporary folder, removed with everything
@@ -48,24 +49,14 @@ public:
     ScopedEnv(const char* name, const std::string& value) : m_name(name)
     {
         if (const char* old = ::getenv(name))
-        {
-            m_hadValue = true;
             m_old = old;
-        }
         ::setenv(name, value.c_str(), 1);
     }
-    ~ScopedEnv()
-    {
-        if (m_hadValue)
-            ::setenv(m_name.c_str(), m_old.c_str(), 1);
-        else
-            ::unsetenv(m_name.c_str());
-    }
+    ~ScopedEnv() { m_old ? ::setenv(m_name.c_str(), m_old->c_str(), 1) : ::unsetenv(m_name.c_str()); }
     ScopedEnv(const ScopedEnv&) = delete;
     ScopedEnv& operator=(const ScopedEnv&) = delete;
 
 private:
     std::string m_name;
-    std::string m_old;
-    bool m_hadValue = false;
+    std::optional<std::string> m_old;
 };
