@@ -87,16 +87,22 @@ TEST_F(ListJobTable, RowsOfAStaleCountGiveNothingAndPaint)
     RenderRows(table); // paints the stale rows without touching missing records
 }
 
-// A virtual cell's own attribute paints that cell only.
+// Virtual rows are painted from the callbacks: a text in column 0, a status circle in
+// column 2, and column 1's own attribute, which colours that cell only.
 class ShadedList : public ProfilesKelvoProfilesListCtrl
 {
 public:
     using ProfilesKelvoProfilesListCtrl::ProfilesKelvoProfilesListCtrl;
+    wxString OnGetItemText(long, long column) const override
+    {
+        return column == 0 ? wxString::FromUTF8("\xE2\x96\x88\xE2\x96\x88") : wxString();
+    }
+    int OnGetItemImage(long, long column) const override { return column == 2 ? kCellImageStatusCircle : -1; }
     wxItemAttr* OnGetItemAttr(long, long column) const override { return column == 1 ? &shaded : nullptr; }
     mutable wxItemAttr shaded{wxNullColour, wxColour(250, 200, 120), wxNullFont};
 };
 
-TEST_F(ListJobTable, AVirtualCellsAttributeColoursItsBackground)
+TEST_F(ListJobTable, VirtualRowsArePaintedFromTheCallbacks)
 {
     auto* list = MakeList<ShadedList>(wxLC_REPORT | wxLC_VIRTUAL);
     for (long column = 0; column < 3; ++column)
@@ -107,6 +113,8 @@ TEST_F(ListJobTable, AVirtualCellsAttributeColoursItsBackground)
     EXPECT_EQ(PixelAt(image, 80 + 75, mid), wxColour(250, 200, 120));
     EXPECT_EQ(PixelAt(image, 75, mid), *wxWHITE);
     EXPECT_EQ(PixelAt(image, 160 + 75, mid), *wxWHITE);
+    EXPECT_GT(CountPixels(image, wxRect(0, 0, 80, 2 * mid), ListTheme().textColour), 10) << "the text";
+    EXPECT_EQ(PixelAt(image, 160 + 1 + 12, 12), ListTheme().textColour) << "the circle";
 }
 
 TEST_F(ListJobTable, CreatesInTwoStepsWithACopyOfTheHeaderRecord)
