@@ -10,6 +10,7 @@
 #include <wx/imaglist.h>
 
 #include <dlfcn.h>
+#include <sstream>
 
 using namespace listtest;
 
@@ -114,72 +115,63 @@ TEST_F(ListPaint, StatusMarksTakeTheItemColourWhileTheTextKeepsTheTheme)
     EXPECT_EQ(info.GetTextColour(), ListTheme().textColour) << "reported as drawn";
 }
 
-struct ProgressCase
-{
-    const char* text;
-    int filled; // of the 96 inner pixels of a 108-pixel column
-};
-
-class ListProgress : public ListFixture, public ::testing::WithParamInterface<ProgressCase>
-{
-};
-
-TEST_P(ListProgress, FillsTheFrameInProportionAndShowsNoText)
+// A progress cell fills its frame in proportion and shows no text.
+TEST_F(ListPaint, ProgressFillsTheFrameInProportionAndShowsNoText)
 {
     auto* list = MakeList(wxLC_REPORT);
     list->InsertColumn(0, wxS("Done"), kColumnFormatProgress, 108);
     list->InsertColumn(1, wxS("Name"), wxLIST_FORMAT_LEFT, 100);
-    list->InsertItem(0, wxString::FromUTF8(GetParam().text));
+    list->InsertItem(0, wxString());
     list->SetItem(0, 1, wxS("x"));
     const int lh = list->GetMainWindow()->GetLineHeight();
-    const wxImage image = RenderRows(list);
-    EXPECT_EQ(CountPixels(image, wxRect(0, lh / 2, 108, 1), *wxBLUE), GetParam().filled);
-    if (GetParam().filled > 0)
-        EXPECT_EQ(PixelAt(image, 3, lh / 2), *wxBLUE) << "the bar starts inside the frame";
-    EXPECT_EQ(CountPixels(image, wxRect(0, 0, 108, lh), ListTheme().textColour), 0);
+    // "text=filled;", of the 96 inner pixels of the 108-pixel column.
+    std::istringstream cases("0=0;50=48;100=96;not a number=0;25.5=24;250=96;-40=0;");
+    for (std::string text, filled; std::getline(cases, text, '=') && std::getline(cases, filled, ';');)
+    {
+        list->SetItem(0, 0, text);
+        const wxImage image = RenderRows(list);
+        EXPECT_EQ(CountPixels(image, wxRect(0, lh / 2, 108, 1), *wxBLUE), std::stoi(filled)) << text;
+        EXPECT_EQ(PixelAt(image, 3, lh / 2) == *wxBLUE, filled != "0")
+            << text << ": the bar starts inside the frame";
+        EXPECT_EQ(CountPixels(image, wxRect(0, 0, 108, lh), ListTheme().textColour), 0) << text;
+    }
 }
-
-INSTANTIATE_TEST_SUITE_P(ListPercentages, ListProgress,
-                         ::testing::Values(ProgressCase{"0", 0}, ProgressCase{"50", 48},
-                                           ProgressCase{"100", 96}, ProgressCase{"not a number", 0},
-                                           ProgressCase{"25.5", 24}, ProgressCase{"250", 96},
-                                           ProgressCase{"-40", 0}));
 
 // A cell shortens its text exactly when the text is wider than the column less
 // eight pixels, and then shows what DrawTextTruncate draws at the cell's place.
 TEST_F(ListPaint, TextIsShortenedExactlyWhenWiderThanTheColumnLessEight)
 {
     const wxString text = wxS("Transferring to server");
+    auto* list = MakeList(wxLC_REPORT);
+    ProfilesKelvoListMainWindow* rows = list->GetMainWindow();
+    const int textWidth = rows->GetTextExtent(text).GetWidth();
+    list->InsertColumn(0, wxS("Status"), wxLIST_FORMAT_LEFT, textWidth);
+    list->InsertItem(0, text);
+    const auto reference = [&](const wxSize& size, bool shortened)
+    {
+        return pixels::Render(size, *wxWHITE,
+                              [&](wxDC& dc)
+                              {
+                                  dc.SetFont(rows->GetFont());
+                                  dc.SetTextForeground(ListTheme().textColour);
+                                  const wxSize extent = dc.GetTextExtent(text);
+                                  const int y = rows->GetLineHeight() / 2 - (extent.GetHeight() + 1) / 2;
+                                  if (shortened)
+                                      DrawTextTruncate(dc, text, wxRect(1, y, textWidth - 1, extent.y), 0,
+                                                       false);
+                                  else
+                                      dc.DrawText(text, 1, y);
+                              });
+    };
     for (int spare : {0, -1})
     {
-        auto* list = MakeList(wxLC_REPORT);
-        ProfilesKelvoListMainWindow* rows = list->GetMainWindow();
-        const int textWidth = rows->GetTextExtent(text).GetWidth();
-        const int columnWidth = textWidth + 8 + spare;
-        list->InsertColumn(0, wxS("Status"), wxLIST_FORMAT_LEFT, columnWidth);
-        list->InsertItem(0, text);
-        const wxRect cell(0, 0, columnWidth, rows->GetLineHeight());
+        list->SetColumnWidth(0, textWidth + 8 + spare);
+        const wxRect cell(0, 0, textWidth + 8 + spare, rows->GetLineHeight());
         const wxImage shown = RenderRows(list).GetSubImage(cell);
-        const auto reference = [&](bool shortened)
-        {
-            return pixels::Render(cell.GetSize(), *wxWHITE,
-                                  [&](wxDC& dc)
-                                  {
-                                      dc.SetFont(rows->GetFont());
-                                      dc.SetTextForeground(ListTheme().textColour);
-                                      const wxSize extent = dc.GetTextExtent(text);
-                                      const int y = rows->GetLineHeight() / 2 - (extent.GetHeight() + 1) / 2;
-                                      if (shortened)
-                                          DrawTextTruncate(dc, text, wxRect(1, y, textWidth - 1, extent.y), 0,
-                                                           false);
-                                      else
-                                          dc.DrawText(text, 1, y);
-                                  });
-        };
-        EXPECT_EQ(pixels::FirstDifference(shown, reference(spare < 0)), "") << "spare " << spare;
-        EXPECT_NE(pixels::FirstDifference(shown, reference(spare >= 0)), "") << "spare " << spare;
-        m_frame->Destroy();
-        m_frame = nullptr;
+        EXPECT_EQ(pixels::FirstDifference(shown, reference(cell.GetSize(), spare < 0)), "")
+            << "spare " << spare;
+        EXPECT_NE(pixels::FirstDifference(shown, reference(cell.GetSize(), spare >= 0)), "")
+            << "spare " << spare;
     }
 }
 
