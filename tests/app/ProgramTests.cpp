@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <pwd.h>
+#include <sys/inotify.h>
 #include <sys/stat.h>
 
 #include <algorithm>
@@ -229,13 +230,28 @@ TEST_F(ProgramWithJournalTest, FifosPlantedWhereTheLocksAndAJournalBelongKeepNot
 {
     const fs::path locks = folder.Path() / "root/dev/shm";
     fs::create_directories(locks);
+    const int watch = ::inotify_init1(IN_NONBLOCK | IN_CLOEXEC);
     for (const fs::path& fifo : {locks / "TiveraJobsStatusFile.lock", locks / "TiveraJobsLogFile.lock",
                                  Data() / "TiveraJobsLogFile.txt"})
+    {
         ASSERT_EQ(::mkfifo(fifo.c_str(), 0666), 0) << fifo;
+        ASSERT_GE(::inotify_add_watch(watch, fifo.c_str(), IN_OPEN), 0) << fifo;
+    }
     Program program(WYX_PROGRAM, Environment("home"));
     const Window window = x.WaitForWindow(program);
     ASSERT_NE(window, 0u) << "no window: the program " << program.Outcome();
-    ::usleep(2500000); // a few polls, each meeting the FIFOs
+    // A few polls, each opening the FIFOs (a watched file's events carry no name).
+    std::size_t opens = 0;
+    for (int wait = 0; wait < 3000 && opens < 6 && !program.HasEnded(); ++wait)
+    {
+        inotify_event events[16];
+        const ssize_t got = ::read(watch, events, sizeof events);
+        opens += got > 0 ? static_cast<std::size_t>(got) / sizeof(inotify_event) : 0;
+        if (got <= 0)
+            ::usleep(20000);
+    }
+    ::close(watch);
+    EXPECT_GE(opens, 6u);
     EXPECT_FALSE(program.HasEnded());
     CloseAndExpectCleanExit(program, window);
 }
