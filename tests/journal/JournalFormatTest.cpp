@@ -49,6 +49,7 @@ TEST_P(JournalEdit, LeavesEveryOtherLineByteForByte)
     arguments.insert(arguments.end(), GetParam().arguments.begin(), GetParam().arguments.end());
     ASSERT_EQ(RunTool(arguments).status, 0);
     EXPECT_EQ(ReadBytes(StatusJournal()), GetParam().after);
+    EXPECT_TRUE(fs::is_regular_file(StatusJournal())) << "an empty journal is still a journal";
 }
 
 INSTANTIATE_TEST_SUITE_P(
