@@ -21,9 +21,9 @@ namespace
 class ListInput : public ListFixture
 {
 protected:
-    void Build(long style, long items)
+    void Build(long style, long items, const std::vector<int>& widths = {100, 100})
     {
-        m_list = MakeRows(style, {100, 100}, items);
+        m_list = MakeRows(style, widths, items);
         m_rows = m_list->GetMainWindow();
         m_events = std::make_unique<EventLog>(m_list);
     }
@@ -44,7 +44,8 @@ protected:
     }
 
     // "click c+s+3" (with Ctrl and Shift), "rclick 3", "dclick 3", "key c+a", "scroll pagedown",
-    // "select 3", "focus 3" (and select), "clear 3" (neither), "count 5", "top 50", "wheel -120".
+    // "select 3", "focus 3" (and select), "clear 3" (neither), "count 5", "top 50", "wheel -120",
+    // and on the header "hclick 50", "hrclick 50" (right button up), "hdrag 50", "hup 50".
     void Do(const std::string& action)
     {
         std::istringstream in(action);
@@ -54,14 +55,14 @@ protected:
         const bool shift = arg.find("s+") != std::string::npos;
         arg = arg.substr(ctrl * 2 + shift * 2);
         const std::string names =
-            " down up pgdn pgup home end space enter a click rclick dclick top bottom lineup "
-            "linedown pageup pagedown hclick hrclick hdrag hup ";
+            " down up pgdn pgup home end space enter left click rclick dclick top bottom lineup "
+            "linedown pageup pagedown hclick hrclick hdrag hup a ";
         const int keys[] = {WXK_DOWN, WXK_UP,    WXK_PAGEDOWN, WXK_PAGEUP, WXK_HOME,
-                            WXK_END,  WXK_SPACE, WXK_RETURN,   'A'};
+                            WXK_END,  WXK_SPACE, WXK_RETURN,   WXK_LEFT};
         const int events[] = {wxEVT_LEFT_DOWN,          wxEVT_RIGHT_DOWN,       wxEVT_LEFT_DCLICK,
                               wxEVT_SCROLLWIN_TOP,      wxEVT_SCROLLWIN_BOTTOM, wxEVT_SCROLLWIN_LINEUP,
                               wxEVT_SCROLLWIN_LINEDOWN, wxEVT_SCROLLWIN_PAGEUP, wxEVT_SCROLLWIN_PAGEDOWN};
-        const int header[] = {wxEVT_LEFT_DOWN, wxEVT_RIGHT_UP, wxEVT_MOTION, wxEVT_LEFT_UP};
+        const int header[] = {wxEVT_LEFT_DOWN, wxEVT_RIGHT_UP, wxEVT_MOTION, wxEVT_LEFT_UP, 'A'};
         const auto code = [&](const std::string& name)
         {
             const auto at = std::count(names.begin(), names.begin() + names.find(" " + name + " "), ' ');
@@ -71,18 +72,25 @@ protected:
         m_rows->LayoutIfNeeded();
         const long item = verb == "key" || verb == "scroll" ? 0 : Item(arg);
         const int lh = m_rows->GetLineHeight();
-        wxMouseEvent wheel(wxEVT_MOUSEWHEEL);
-        wheel.m_wheelRotation = static_cast<int>(item);
-        wheel.m_wheelDelta = 120;
-        wheel.m_linesPerAction = 3;
+        const bool onHeader = verb[0] == 'h';
+        wxMouseEvent mouse(onHeader || verb.find("click") != std::string::npos ? code(verb)
+                                                                               : int(wxEVT_MOUSEWHEEL));
+        mouse.SetPosition(onHeader ? wxPoint(item, 10)
+                                   : wxPoint(50, int((item - m_rows->GetTopItem()) * lh + lh / 2)));
+        mouse.SetControlDown(ctrl);
+        mouse.SetShiftDown(shift);
+        mouse.SetLeftDown(verb == "hdrag" || mouse.GetEventType() == wxEVT_LEFT_DOWN);
+        mouse.m_wheelRotation = static_cast<int>(item);
+        mouse.m_wheelDelta = 120;
+        mouse.m_linesPerAction = 3;
+        wxKeyEvent key(wxEVT_KEY_DOWN);
+        key.m_keyCode = verb == "key" ? code(arg) : 0;
+        key.SetControlDown(ctrl);
+        key.SetShiftDown(shift);
         wxScrollWinEvent scroll(verb == "scroll" ? code(arg) : 0, 0, wxVERTICAL);
-        if (verb[0] == 'h')
-            SendMouse(m_list->GetHeaderWindow(), code(verb), static_cast<int>(item), 10, false, false,
-                      verb == "hdrag");
-        else if (verb.find("click") != std::string::npos)
-            SendMouse(m_rows, code(verb), 50, int((item - m_rows->GetTopItem()) * lh + lh / 2), ctrl, shift);
-        else if (verb == "key")
-            SendKey(m_rows, code(arg), ctrl, shift);
+        wxWindow* target = onHeader ? static_cast<wxWindow*>(m_list->GetHeaderWindow()) : m_rows;
+        if (verb == "key" || verb == "scroll")
+            target->GetEventHandler()->ProcessEvent(verb == "key" ? static_cast<wxEvent&>(key) : scroll);
         else if (verb == "select")
             m_list->SetItemState(item, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
         else if (verb == "focus" || verb == "clear")
@@ -92,7 +100,7 @@ protected:
         else if (verb == "top")
             m_rows->ScrollToTop(item);
         else
-            m_rows->GetEventHandler()->ProcessEvent(verb == "wheel" ? static_cast<wxEvent&>(wheel) : scroll);
+            target->GetEventHandler()->ProcessEvent(mouse);
     }
 
     void Run(const std::string& script)
@@ -280,8 +288,7 @@ TEST_F(ListInput, DraggingABorderResizesTheColumnDownToItsMinimumUnlessVetoed)
 
 TEST_F(ListInput, ColumnsWiderThanTheWindowScrollSidewaysWithTheHeader)
 {
-    m_list = MakeRows(wxLC_VRULES, {300, 300, 300}, 1);
-    m_rows = m_list->GetMainWindow();
+    Build(wxLC_VRULES, 1, {300, 300, 300});
     const int client = m_rows->GetClientSize().GetWidth();
     EXPECT_EQ(m_rows->GetScrollRange(wxHORIZONTAL), 900);
     EXPECT_EQ(m_rows->GetScrollThumb(wxHORIZONTAL), client);
@@ -294,7 +301,7 @@ TEST_F(ListInput, ColumnsWiderThanTheWindowScrollSidewaysWithTheHeader)
     const wxImage rows = RenderRows(m_list);
     EXPECT_EQ(PixelAt(rows, 198, m_rows->GetLineHeight() / 2), ListTheme().lineColour);
     EXPECT_EQ(PixelAt(rows, 498, m_rows->GetLineHeight() / 2), ListTheme().lineColour);
-    SendKey(m_rows, WXK_LEFT);
+    Run("key left|K-1|;");
     EXPECT_EQ(m_rows->GetScrollX(), 85);
     m_rows->ScrollToX(100000);
     EXPECT_EQ(m_rows->GetScrollX(), 900 - client) << "no scrolling past the last column";

@@ -70,7 +70,8 @@ TEST_F(ListPaint, RowFillsAndTextFollowAlternationSelectionAndFocus)
     const int lh = list->GetMainWindow()->GetLineHeight();
     const auto fill = [&](const wxImage& image, int row) { return PixelAt(image, 150, row * lh + lh / 2); };
 
-    SendFocus(list->GetMainWindow(), true);
+    wxFocusEvent focus(wxEVT_SET_FOCUS);
+    list->GetMainWindow()->GetEventHandler()->ProcessEvent(focus);
     wxImage image = RenderRows(list);
     EXPECT_EQ(fill(image, 0), *wxWHITE);
     EXPECT_EQ(fill(image, 1), ListTheme().selectionColour);
@@ -83,7 +84,8 @@ TEST_F(ListPaint, RowFillsAndTextFollowAlternationSelectionAndFocus)
     EXPECT_EQ(CountPixels(image, first, ListTheme().selectedTextColour), 0);
     EXPECT_GT(CountPixels(image, second, ListTheme().selectedTextColour), 10);
     EXPECT_EQ(CountPixels(image, second, ListTheme().textColour), 0);
-    SendFocus(list->GetMainWindow(), false);
+    focus.SetEventType(wxEVT_KILL_FOCUS);
+    list->GetMainWindow()->GetEventHandler()->ProcessEvent(focus);
     EXPECT_EQ(fill(RenderRows(list), 1), ListTheme().inactiveSelectionColour);
 }
 

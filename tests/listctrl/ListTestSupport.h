@@ -129,34 +129,4 @@ public:
     int lastKeyCode = 0;
 };
 
-// Events delivered straight to a window's handler, as the toolkit would.
-inline void SendMouse(wxWindow* window, wxEventType type, int x, int y, bool ctrl = false, bool shift = false,
-                      bool leftIsDown = false)
-{
-    wxMouseEvent event(type);
-    event.SetEventObject(window);
-    event.SetPosition(wxPoint(x, y));
-    event.SetControlDown(ctrl);
-    event.SetShiftDown(shift);
-    event.SetLeftDown(leftIsDown || type == wxEVT_LEFT_DOWN);
-    window->GetEventHandler()->ProcessEvent(event);
-}
-
-inline void SendKey(wxWindow* window, int keyCode, bool ctrl = false, bool shift = false)
-{
-    wxKeyEvent event(wxEVT_KEY_DOWN);
-    event.SetEventObject(window);
-    event.m_keyCode = keyCode;
-    event.SetControlDown(ctrl);
-    event.SetShiftDown(shift);
-    window->GetEventHandler()->ProcessEvent(event);
-}
-
-inline void SendFocus(wxWindow* window, bool gained)
-{
-    wxFocusEvent event(gained ? wxEVT_SET_FOCUS : wxEVT_KILL_FOCUS);
-    event.SetEventObject(window);
-    window->GetEventHandler()->ProcessEvent(event);
-}
-
 } // namespace listtest
