@@ -102,6 +102,7 @@ protected:
 TEST_F(ComboBox, IsAReadOnlyBoxWithItsOwnPopupAndRowsOfEighteenPixels)
 {
     EXPECT_TRUE(combo->HasFlag(wxCB_READONLY));
+    EXPECT_FALSE(combo->GetShowTooltip()) << "no tooltip unless asked for";
     EXPECT_NE(dynamic_cast<CustomComboPopup*>(combo->GetPopupControl()), nullptr);
     EXPECT_EQ(combo->OnMeasureItem(2), 18);
     EXPECT_EQ(combo->OnMeasureItemWidth(2), -1) << "the library's width";
