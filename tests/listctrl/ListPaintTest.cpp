@@ -11,6 +11,7 @@
 
 #include <dlfcn.h>
 #include <sstream>
+#include <string>
 
 using namespace listtest;
 
@@ -21,32 +22,37 @@ const wxColour kRed(220, 0, 0);
 
 using ListPaint = ListFixture;
 
+// The pixels along a line as letters: l for the rule colour, w for white, ? else.
+std::string Strip(const wxImage& image, wxPoint at, const wxPoint& step, int length)
+{
+    std::string letters;
+    for (; length-- > 0; at += step)
+        letters += PixelAt(image, at.x, at.y) == ListTheme().lineColour ? 'l'
+                   : PixelAt(image, at.x, at.y) == *wxWHITE             ? 'w'
+                                                                        : '?';
+    return letters;
+}
+
 TEST_F(ListPaint, RulesSeparateRowsAndColumnsAndCloseTheLastItem)
 {
-    auto* list = MakeRows(wxLC_HRULES | wxLC_VRULES, {100, 80, 60}, 3);
+    auto* list = MakeRows(wxLC_HRULES | wxLC_VRULES, {100, 80, 60}, 3, wxS(" "));
     const int lh = list->GetMainWindow()->GetLineHeight();
     const wxImage image = RenderRows(list);
-    const wxColour line = ListTheme().lineColour;
+    // Across the middle of each row: the rules stand two pixels left of each column's edge.
+    std::string across(300, 'w');
     for (int edge : {100, 180, 240})
-    {
-        for (int row = 0; row < 3; ++row)
-        {
-            const int y = row * lh + lh / 2;
-            EXPECT_EQ(PixelAt(image, edge - 2, y), line) << "edge " << edge << " row " << row;
-            EXPECT_EQ(PixelAt(image, edge - 1, y), *wxWHITE) << "edge " << edge << " row " << row;
-            EXPECT_EQ(PixelAt(image, edge - 3, y), *wxWHITE) << "edge " << edge << " row " << row;
-        }
-        EXPECT_EQ(PixelAt(image, edge - 2, 0), line) << "from the top of the first visible row";
-        EXPECT_EQ(PixelAt(image, edge - 2, 3 * lh + 2), *wxWHITE) << "to the end of the last row";
-    }
-    EXPECT_EQ(PixelAt(image, 50, 0), *wxWHITE) << "no line above the first visible row";
-    for (int y : {lh, 2 * lh, 3 * lh})
-    {
-        EXPECT_EQ(PixelAt(image, 50, y), line) << "y " << y;
-        EXPECT_EQ(PixelAt(image, image.GetWidth() - 1, y), line) << "across the whole width, y " << y;
-    }
-    EXPECT_EQ(PixelAt(image, 50, 3 * lh + 1), *wxWHITE);
-    EXPECT_EQ(PixelAt(image, 50, 4 * lh), *wxWHITE) << "nothing below the last item";
+        across[edge - 2] = 'l';
+    for (int row = 0; row < 3; ++row)
+        EXPECT_EQ(Strip(image, {0, row * lh + lh / 2}, {1, 0}, 300), across) << "row " << row;
+    // Down a column and down a rule: no line above the first row, one under each row,
+    // and the vertical rule from the top to the line under the last row.
+    std::string down(4 * lh + 1, 'w');
+    for (int row = 1; row <= 3; ++row)
+        down[row * lh] = 'l';
+    EXPECT_EQ(Strip(image, {50, 0}, {0, 1}, 4 * lh + 1), down);
+    EXPECT_EQ(Strip(image, {98, 0}, {0, 1}, 3 * lh + 3), std::string(3 * lh + 1, 'l') + "ww");
+    EXPECT_EQ(PixelAt(image, image.GetWidth() - 1, 3 * lh), ListTheme().lineColour)
+        << "across the whole width";
 
     // Scrolled: no line above the first visible row, none under a row that is not the last.
     m_frame->Destroy();
@@ -54,11 +60,11 @@ TEST_F(ListPaint, RulesSeparateRowsAndColumnsAndCloseTheLastItem)
     ProfilesKelvoListMainWindow* rows = list->GetMainWindow();
     rows->ScrollToTop(10);
     const wxImage scrolled = RenderRows(list);
-    EXPECT_EQ(PixelAt(scrolled, 50, 0), *wxWHITE);
-    EXPECT_EQ(PixelAt(scrolled, 50, lh), line);
-    const int underLast = static_cast<int>((rows->GetLastVisibleItem() - 10 + 1) * lh);
+    const long shown = rows->GetLastVisibleItem() - 10;
+    EXPECT_EQ(Strip(scrolled, {150, 0}, {0, lh}, static_cast<int>(shown) + 1), "w" + std::string(shown, 'l'));
+    const int underLast = static_cast<int>((shown + 1) * lh);
     if (underLast < scrolled.GetHeight())
-        EXPECT_EQ(PixelAt(scrolled, 50, underLast), *wxWHITE);
+        EXPECT_EQ(PixelAt(scrolled, 150, underLast), *wxWHITE);
 }
 
 TEST_F(ListPaint, RowFillsAndTextFollowAlternationSelectionAndFocus)
