@@ -23,7 +23,6 @@ inline wxArrayString Strings(std::initializer_list<const char*> texts)
 class SystemRoot : public wyxtest::SystemRoot
 {
 public:
-    SystemRoot() : wyxtest::SystemRoot("wyx-log") {}
     wxString JournalPath() const { return GetDataDirectory() + "TiveraJobsLogFile.txt"; }
 };
 

@@ -77,7 +77,7 @@ protected:
         ASSERT_TRUE(file.Write(text, std::strlen(text)));
     }
 
-    wyxtest::SystemRoot m_root{"wyx-datasource"};
+    wyxtest::SystemRoot m_root;
     const wxString m_ini = GetDataDirectory() + "HotFolders.ini";
     WyxDataSource& m_source = WyxDataSource::GetInstance();
 };

@@ -15,7 +15,6 @@ using wyxtest::WxEnvironment;
 class SystemRoot : public wyxtest::SystemRoot
 {
 public:
-    SystemRoot() : wyxtest::SystemRoot("wyx-status") {}
     wxString JournalPath() const { return GetDataDirectory() + "TiveraJobsStatusFile.txt"; }
     wxString LockPath() const { return Path() + "/dev/shm/TiveraJobsStatusFile.lock"; }
 };

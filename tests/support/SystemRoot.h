@@ -12,6 +12,7 @@
 #include <wx/string.h>
 #include <wx/utils.h>
 
+#include "TempFolder.h"
 #include "data/DataLocations.h"
 
 namespace wyxtest
@@ -34,20 +35,12 @@ private:
 class SystemRoot
 {
 public:
-    explicit SystemRoot(const char* prefix = "wyx-test")
+    SystemRoot() : m_root(wxString::FromUTF8(m_folder.Path().string()))
     {
-        const wxString base = wxFileName::CreateTempFileName(prefix);
-        wxRemoveFile(base);
-        m_root = base;
-        wxFileName::Mkdir(m_root, wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
         wxSetEnv("WYX_SYSTEM_ROOT", m_root);
         wxFileName::Mkdir(GetDataDirectory(), wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
     }
-    ~SystemRoot()
-    {
-        wxFileName::Rmdir(m_root, wxPATH_RMDIR_RECURSIVE);
-        wxUnsetEnv("WYX_SYSTEM_ROOT");
-    }
+    ~SystemRoot() { wxUnsetEnv("WYX_SYSTEM_ROOT"); }
     SystemRoot(const SystemRoot&) = delete;
     SystemRoot& operator=(const SystemRoot&) = delete;
 
@@ -80,6 +73,7 @@ private:
         ASSERT_TRUE(file.Write(text, wxConvUTF8)) << path;
     }
 
+    TempFolder m_folder; // removed after the variable is unset
     wxString m_root;
 };
 
