@@ -46,6 +46,13 @@ bool HasState(AtkObject* object, AtkStateType state)
     return has;
 }
 
+// Shows the frame and waits until the toolkit has mapped it.
+void ShowMapped(wxFrame* frame)
+{
+    frame->Show();
+    ASSERT_TRUE(guitest::PumpUntil([&] { return HasState(AccessibleOf(frame), ATK_STATE_SHOWING); }));
+}
+
 std::string Attribute(AtkObject* object, const char* name)
 {
     AtkAttributeSet* attributes = atk_object_get_attributes(object);
@@ -158,8 +165,7 @@ protected:
             for (int column = 1; column < 3; ++column)
                 list->SetItem(row, column, wxString::FromUTF8(rows[row][column]));
         }
-        frame->Show();
-        guitest::Pump(50);
+        ShowMapped(frame);
         return list;
     }
 
@@ -272,8 +278,7 @@ TEST_F(AccessibleListTest, AVirtualListsCellsAreMadeWhenAskedAndReadOneTextEach)
 {
     auto* list = MakeList<CountingList>(wxLC_REPORT | wxLC_VIRTUAL | wxLC_SINGLE_SEL);
     list->SetItemCount(100000);
-    frame->Show();
-    guitest::Pump(50);
+    ShowMapped(frame);
     AtkObject* table = AccessibleOf(list);
     EXPECT_EQ(atk_object_get_n_accessible_children(table), 300000);
 
@@ -305,7 +310,7 @@ TEST_F(AccessibleListTest, ADestroyedListAnswersAsGoneWhileAToolStillHoldsItsObj
     ASSERT_EQ(Name(cell), "b.ps");
 
     list->Destroy();
-    guitest::Pump(20);
+    ASSERT_TRUE(guitest::PumpUntil([&] { return HasState(table, ATK_STATE_DEFUNCT); }));
 
     EXPECT_TRUE(HasState(table, ATK_STATE_DEFUNCT));
     EXPECT_EQ(atk_table_get_n_rows(ATK_TABLE(table)), 0);
@@ -326,8 +331,7 @@ TEST_F(AccessibleListTest, ADestroyedListAnswersAsGoneWhileAToolStillHoldsItsObj
 
 TEST_F(AccessibleListTest, AListMadeAfterTheWindowIsShownIsAnnounced)
 {
-    frame->Show();
-    guitest::Pump(50);
+    ShowMapped(frame);
     AtkObject* parent = AccessibleOf(frame);
     ASSERT_NE(parent, nullptr);
     SignalLog added;
@@ -354,8 +358,7 @@ protected:
         for (const char* entry : {"All", "PRN-01", "PRN-02"})
             combo->Append(entry);
         combo->SetSelection(1);
-        frame->Show();
-        guitest::Pump(50);
+        ShowMapped(frame);
     }
     void TearDown() override
     {
@@ -408,8 +411,8 @@ TEST_F(AccessibleComboTest, TheBoxIsAComboBoxWithItsEntriesAsAListShownWhenDropp
                      &expanded);
 
     combo->ShowPopup();
-    ASSERT_TRUE(guitest::PumpUntil([&] { return combo->IsPopupShown(); }));
-    guitest::Pump(50);
+    ASSERT_TRUE(
+        guitest::PumpUntil([&] { return combo->IsPopupShown() && HasState(box, ATK_STATE_EXPANDED); }));
     EXPECT_TRUE(HasState(box, ATK_STATE_EXPANDED));
     EXPECT_TRUE(HasState(list, ATK_STATE_SHOWING));
     EXPECT_GE(expanded.count, 1);
