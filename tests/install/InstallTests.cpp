@@ -21,12 +21,12 @@ class InstalledTest : public ::testing::Test
 protected:
     void SetUp() override { ASSERT_TRUE(box.Ready()); }
 
-    // Starts the program in German (the title shows the shipped catalogs were
-    // found); wyx-journal writes and reads a journal below the system root and
-    // the simulator answers --help. A tool exits 127 when a library is missing.
+    // Starts the program, which the case set up to come in German (the title
+    // shows a catalog was found); wyx-journal writes and reads a journal below
+    // the system root and the simulator answers --help. A tool exits 127 when a
+    // library is missing.
     void ExpectProgramsRun(const std::filesystem::path& bin)
     {
-        box.folder.Write("home/.config/Corvane Quillet/current.lang", "de_DE\n");
         Program copy((bin / kProgramName).string(), box.environment);
         if (const Window window = box.WaitForWindow(copy))
         {
@@ -71,6 +71,18 @@ TEST_F(InstalledTest, AnInstallToAnyPrefixRunsWithoutALibraryPath)
                     std::filesystem::exists(prefix / "lib/wyxprogress" / name))
             << name;
     }
+    // German from the server's file: only if the configuration beside the
+    // program (first in the lookup order) is read over the shipped one, which
+    // says 3.3; and the catalogs only through the install path in the registry.
+    std::filesystem::remove_all(prefix / "share/wyxprogress/LocalizedStrings");
+    box.folder.Write(
+        "prefix with space/bin/WyxConfig.cfg",
+        "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<Configuration>\n  <WyxConfiguration>\n"
+        "    <Entry key=\"APP_WYX_VERSION\" value=\"3.1\"/>\n  </WyxConfiguration>\n</Configuration>\n");
+    box.folder.Write("root/etc/kelvo/registry.ini",
+                     "[SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve]\nInstallPath=" +
+                         std::filesystem::path(WYX_CATALOG_DIR).parent_path().string() + "\n");
+    box.folder.Write("root/srv/kelvo/server/lcdstr/current.lang", "serverlang=de\n");
     ExpectProgramsRun(prefix / "bin");
 }
 
@@ -97,6 +109,8 @@ TEST_F(InstalledTest, TheDebianPackageRunsWhereItIsUnpacked)
           "usr/share/icons/hicolor/256x256/apps/wyxprogress.png", "usr/share/wyxprogress/WyxConfig.cfg",
           "usr/lib/wyxprogress/libwyx_os.so", "usr/share/doc/wyxprogress/copyright"})
         EXPECT_TRUE(std::filesystem::is_regular_file(unpacked / file)) << file;
+    // German from the user's file, with the shipped configuration and catalogs.
+    box.folder.Write("home/.config/Corvane Quillet/current.lang", "de_DE\n");
     ExpectProgramsRun(unpacked / "usr/bin");
 }
 
