@@ -151,18 +151,11 @@ protected:
     bool vetoChanges = false;
 };
 
-TEST_F(NotebookTest, ShowsThePagesInOrderAndTheFirstWithoutEvents)
-{
-    EXPECT_EQ(State(), "First*+ Second Third");
-    for (size_t i = 0; i < 3; ++i)
-        EXPECT_TRUE(book->GetPage(i) == pages[i] && book->GetPageImage(i) == 1) << i;
-    ASSERT_EQ(tabs.size(), 3u);
-    EXPECT_TRUE(tabs[0].GetRight() < tabs[1].GetLeft() && tabs[1].GetRight() < tabs[2].GetLeft());
-    EXPECT_TRUE(events.empty());
-}
-
 TEST_F(NotebookTest, AClickOnATabSelectsItWithChangingThenChangedUnlessVetoed)
 {
+    EXPECT_EQ(State(), "First*+ Second Third");
+    ASSERT_EQ(tabs.size(), 3u);
+    EXPECT_TRUE(tabs[0].GetRight() < tabs[1].GetLeft() && tabs[1].GetRight() < tabs[2].GetLeft());
     // Where a click lands: on a tab, or on the page below the strip.
     long flags = 0;
     EXPECT_EQ(book->HitTest(tabs[1].GetPosition() + wxPoint(1, 1), &flags), 1);
@@ -188,24 +181,22 @@ TEST_F(NotebookTest, AClickOnATabSelectsItWithChangingThenChangedUnlessVetoed)
     EXPECT_TRUE(events.empty()) << "ChangeSelection sends nothing";
 }
 
-TEST_F(NotebookTest, ControlKeysInAPageCycleThroughThePages)
+TEST_F(NotebookTest, ControlKeysInAPageCycleAndArrowsOnTheStripMoveWithoutWrapping)
 {
     // key, modifiers, the pages selected by each press from page 0.
-    for (const auto& [key, modifiers, selections] : {std::tuple{WXK_TAB, int(wxMOD_CONTROL), "1201"},
-                                                     {WXK_TAB, wxMOD_CONTROL | wxMOD_SHIFT, "2102"},
+    for (const auto& [key, modifiers, selections] : {std::tuple{WXK_TAB, int(wxMOD_CONTROL), "120"},
+                                                     {WXK_TAB, wxMOD_CONTROL | wxMOD_SHIFT, "210"},
                                                      {WXK_PAGEDOWN, wxMOD_CONTROL, "120"},
                                                      {WXK_PAGEUP, wxMOD_CONTROL, "210"}})
     {
         book->ChangeSelection(0);
         for (int previous = 0, i = 0; selections[i]; previous = selections[i++] - '0')
         {
-            const int expected = selections[i] - '0';
             events.clear();
             PressInPage(key, modifiers);
-            ASSERT_EQ(book->GetSelection(), expected) << key << " " << modifiers << " press " << i;
-            EXPECT_TRUE(book->GetPage(expected)->IsShown() && !book->GetPage(previous)->IsShown());
-            EXPECT_EQ(events, (std::vector<wxString>{wxString::Format("changing %d>%d", previous, expected),
-                                                     wxString::Format("changed %d>%d", previous, expected)}));
+            const wxString step = wxString::Format("%d>%d", previous, selections[i] - '0');
+            ASSERT_EQ(events, (std::vector<wxString>{"changing " + step, "changed " + step})) << key;
+            EXPECT_TRUE(book->GetCurrentPage()->IsShown() && !book->GetPage(previous)->IsShown());
         }
     }
 
@@ -217,37 +208,29 @@ TEST_F(NotebookTest, ControlKeysInAPageCycleThroughThePages)
     PressInPage(WXK_TAB, wxMOD_NONE);
     PressInPage(WXK_PAGEDOWN, wxMOD_SHIFT);
     EXPECT_EQ(State(), "First*+ Second Third");
-    EXPECT_TRUE(events.empty());
-    EXPECT_TRUE(reachedFrame);
-}
+    EXPECT_TRUE(events.empty() && reachedFrame);
 
-TEST_F(NotebookTest, ArrowKeysOnTheStripMoveWithoutWrapping)
-{
     for (const auto& [key, selection] :
          {std::pair{WXK_LEFT, 0}, {WXK_RIGHT, 1}, {WXK_END, 2}, {WXK_RIGHT, 2}, {WXK_HOME, 0}})
         EXPECT_EQ(PressOnStrip(key), selection) << key;
 }
 
-TEST_F(NotebookTest, DrawsTheSelectedAndTheHoveredTabInTheirColoursOpenOntoThePage)
+// Which tab shows as selected is read back from the display below; here the
+// parts a paint of the strip alone can show.
+TEST_F(NotebookTest, DrawsTheAccentTheBorderAndTheHoveredTabOpenOntoThePage)
 {
     const CNNotebookCustomInfo& info = book->GetCustomInfo();
     const int bottom = book->GetTabStrip()->GetClientSize().y - 1;
-    EXPECT_EQ(PixelOfStrip(FillPoint(tabs[0])), kPage);
-    EXPECT_EQ(PixelOfStrip(FillPoint(tabs[1])), kStrip);
     EXPECT_EQ(PixelOfStrip(wxPoint(Middle(tabs[0]).x, tabs[0].y)), info.accentColour);
     EXPECT_EQ(PixelOfStrip(wxPoint(Middle(tabs[1]).x, tabs[1].y)), kStrip);
     EXPECT_EQ(PixelOfStrip(wxPoint(Middle(tabs[0]).x, bottom)), kPage) << "the selected tab joins its page";
     EXPECT_EQ(PixelOfStrip(wxPoint(Middle(tabs[1]).x, bottom)), info.borderColour);
 
-    ClickTab(1);
-    EXPECT_EQ(PixelOfStrip(FillPoint(tabs[0])), kStrip);
-    EXPECT_EQ(PixelOfStrip(FillPoint(tabs[1])), kPage);
-
     const wxColour hover = info.states[CNNotebookCustomInfo::Hover].fillColour;
     ASSERT_TRUE(hover != kStrip && hover != kPage);
     MouseOnStrip(wxEVT_MOTION, tabs[2].GetPosition() + wxPoint(2, tabs[2].height / 2));
     EXPECT_EQ(PixelOfStrip(FillPoint(tabs[2])), hover);
-    EXPECT_EQ(PixelOfStrip(FillPoint(tabs[0])), kStrip);
+    EXPECT_EQ(PixelOfStrip(FillPoint(tabs[1])), kStrip);
     MouseOnStrip(wxEVT_LEAVE_WINDOW, wxPoint());
     EXPECT_EQ(PixelOfStrip(FillPoint(tabs[2])), kStrip);
 }
@@ -275,12 +258,13 @@ TEST_F(NotebookTest, ThePaintedStripShowsTheSelectedTabInItsColour)
 }
 #endif
 
-TEST_F(NotebookTest, PagesFillTheAreaBelowTheStripAndHooksChangeTheLayout)
+// The page shown at start fills the area below the strip as MainFrameTest checks;
+// here a page shown later, the owner's hooks and the tab's own extras.
+TEST_F(NotebookTest, PagesFillTheAreaBelowTheStripAndHooksAndExtrasChangeTheLayout)
 {
     book->SetSize(400, 250);
     const int strip = book->GetTabStripHeight();
     EXPECT_EQ(book->GetTabStrip()->GetRect(), wxRect(0, 0, 400, strip));
-    EXPECT_EQ(pages[0]->GetRect(), wxRect(0, strip, 400, 250 - strip));
     ClickTab(2);
     EXPECT_EQ(pages[2]->GetRect(), wxRect(0, strip, 400, 250 - strip));
 
@@ -298,6 +282,13 @@ TEST_F(NotebookTest, PagesFillTheAreaBelowTheStripAndHooksChangeTheLayout)
     ASSERT_EQ(book->decorated.size(), 3u);
     for (size_t i = 0; i < 3; ++i)
         EXPECT_EQ(book->decorated[i], std::make_pair(i, grown[i]));
+
+    book->extraPadding = book->extraTabSize = wxSize();
+    ASSERT_TRUE(book->AddPage(new wxPanel(book), "Wide", false, -1, nullptr, 140, true));
+    EXPECT_EQ(book->GetTabRects().at(3).width, 140);
+    ASSERT_TRUE(book->SetPageImage(0, 99));
+    PixelOfStrip(wxPoint()); // must not fail on the missing image
+    EXPECT_EQ(book->GetTabRects()[0].width, tabs[0].width - 16 - 6);
 }
 
 TEST_F(NotebookTest, AddingAndRemovingPagesKeepsTheSelectionOnTheSamePageOrItsNeighbour)
@@ -322,12 +313,4 @@ TEST_F(NotebookTest, AddingAndRemovingPagesKeepsTheSelectionOnTheSamePageOrItsNe
     EXPECT_FALSE(book->DeletePage(0));
 }
 
-TEST_F(NotebookTest, TabExtrasSetTheWidthAndUnknownImagesAreLeftOut)
-{
-    ASSERT_TRUE(book->AddPage(new wxPanel(book), "Wide", false, -1, nullptr, 140, true));
-    EXPECT_EQ(book->GetTabRects().at(3).width, 140);
-    ASSERT_TRUE(book->SetPageImage(0, 99));
-    PixelOfStrip(wxPoint()); // must not fail on the missing image
-    EXPECT_EQ(book->GetTabRects()[0].width, tabs[0].width - 16 - 6);
-}
 } // namespace
