@@ -10,23 +10,18 @@
 #include "views/ErrorWndBkgLog.h"
 
 #include "../log/LogTestSupport.h"
-#include "GuiTest.h"
+#include "ViewTest.h"
 
-#include <gtest/gtest.h>
-#include <wx/frame.h>
 #include <wx/listctrl.h>
 #include <wx/modalhook.h>
 #include <wx/msgdlg.h>
 #include <wx/radiobut.h>
-#include <wx/statusbr.h>
 
 #include <deque>
-#include <vector>
 
 namespace
 {
 using logtest::LogLine;
-using Texts = std::vector<wxString>;
 
 // Answers the message boxes in place of a person and notes what they said.
 class DialogScript : public wxModalDialogHook
@@ -40,13 +35,10 @@ protected:
     int Enter(wxDialog* dialog) override
     {
         messages.push_back(static_cast<wxMessageDialog*>(dialog)->GetMessage());
-        if (answers.empty())
-        {
-            ADD_FAILURE() << "unexpected dialog: " << messages.back();
-            return wxID_CANCEL;
-        }
-        const int answer = answers.front();
-        answers.pop_front();
+        EXPECT_FALSE(answers.empty()) << "unexpected dialog: " << messages.back();
+        const int answer = answers.empty() ? wxID_CANCEL : answers.front();
+        if (!answers.empty())
+            answers.pop_front();
         return answer;
     }
     void Exit(wxDialog*) override {}
@@ -58,7 +50,7 @@ private:
 const wxString kConfirmation = "Are you sure you want to permanently clear the log for all the Duv Ureruve?";
 const wxString kInUse = "The log is in use and could not be cleared. Try again in a moment.";
 
-class LogView : public ::testing::Test
+class LogView : public ViewTest<JobLogView, JobLogManager, logtest::SystemRoot>
 {
 protected:
     void SetUp() override
@@ -66,16 +58,9 @@ protected:
         folders = root.MakeHotFolders(logtest::Strings({"In", "Out", "Idle"}));
         for (const wxString& folder : folders)
             logtest::SystemRoot::WriteFile(Marker(folder), "");
-        frame = new wxFrame(nullptr, wxID_ANY, "log", wxPoint(0, 0), wxSize(1000, 600));
-        view = new JobLogView(frame, wxID_ANY, model);
-        frame->Show();
-        ASSERT_TRUE(guitest::PumpUntil([this] { return List()->GetMainWindow()->GetClientSize().y > 100; }));
+        Open(wxSize(1000, 600));
     }
-    void TearDown() override
-    {
-        frame->Destroy();
-        guitest::Pump(10);
-    }
+    wxWindow* RowsWindow() const override { return List()->GetMainWindow(); }
 
     static wxString Marker(const wxString& folder) { return folder + "/[_KELVO_HotFolder_]/Error.er"; }
 
@@ -102,7 +87,6 @@ protected:
     void Send(wxEvent& event) { List()->GetEventHandler()->ProcessEvent(event); }
 
     ProfilesKelvoProfilesListCtrl* List() const { return view->GetLogList(); }
-    wxString Footer() const { return view->GetFooter()->GetStatusText(0); }
     bool DetailShown() const { return view->GetErrorPanel()->IsShown(); }
     wxRadioButton* Radio(wxWindowID id) const { return wxDynamicCast(view->FindWindow(id), wxRadioButton); }
 
@@ -138,11 +122,7 @@ protected:
                (wxFileExists(Marker(folders[0])) ? "marked" : "");
     }
 
-    logtest::SystemRoot root;
-    JobLogManager model{root.JournalPath()};
     wxArrayString folders;
-    wxFrame* frame = nullptr;
-    JobLogView* view = nullptr;
 };
 
 TEST_F(LogView, JournalLinesBecomeRowsAtTheEndWhateverTheSort)
@@ -161,7 +141,6 @@ TEST_F(LogView, JournalLinesBecomeRowsAtTheEndWhateverTheSort)
     model.Refresh();
     Produce(LogLine("d", "ADDED", "Failed", folders[1]));
     EXPECT_EQ(Column(1), (Texts{"b", "a", "c", "d"}));
-    EXPECT_EQ(Column(2), (Texts{"Out", "In", "In", "Out"}));
     EXPECT_EQ(Column(5), (Texts{"Failed", "Transferred Successfully", "Failed", "Failed"}));
     for (const auto& [row, image] : {std::pair{1, int(kCellImageNone)}, {2, 0}})
     {
@@ -241,29 +220,24 @@ TEST_F(LogView, ColumnsShowTheLongestTextsWhole)
     }
 }
 
-TEST_F(LogView, ClearAllAsksNothingOfAnEmptyLogAndAnsweredNoChangesNothing)
+TEST_F(LogView, ClearAllWhileTheProducerHoldsTheLogChangesNothingAndSaysSoThenClearsOnceFree)
 {
     {
         DialogScript script({});
-        PressClearAll();
-        EXPECT_TRUE(script.messages.empty());
+        PressClearAll(); // an empty log: nothing to ask
     }
-    Produce(LogLine("bad", "ADDED", "Failed", folders[0]));
-    const wxString before = Kept();
-    DialogScript script({wxID_NO});
-    PressClearAll();
-    EXPECT_EQ(script.messages, (Texts{kConfirmation}));
-    EXPECT_FALSE(view->IsClearing());
-    EXPECT_EQ(Kept(), before);
-}
-
-TEST_F(LogView, ClearAllWhileTheProducerHoldsTheLogChangesNothingAndSaysSoThenClearsOnceFree)
-{
     Produce(LogLine("bad", "ADDED", "Failed", folders[0]) +
             LogLine("ok", "ADDED", "Transferred Successfully"));
     Select(0);
     const wxString before = Kept();
     ASSERT_EQ(before, "bad,ok|1 of 2 items selected.|detail|2|1|marked");
+    {
+        DialogScript script({wxID_NO});
+        PressClearAll();
+        EXPECT_EQ(script.messages, (Texts{kConfirmation}));
+        EXPECT_FALSE(view->IsClearing());
+        EXPECT_EQ(Kept(), before) << "answered No";
+    }
     named_mutex_lock producer("TiveraJobsLogFile");
     ASSERT_TRUE(producer.try_lock());
     {
