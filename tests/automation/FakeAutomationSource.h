@@ -22,8 +22,6 @@ struct FakeSource : automation::AutomationSource
     long top = 0;
     long lastVisible = -1;
     bool singleSelection = true;
-    int rowHeight = 20;
-    int itemHeight = 18;
     std::optional<int> headerHeight;
     int scrolledLeft = 0;
     bool dropped = false;
@@ -61,8 +59,8 @@ struct FakeSource : automation::AutomationSource
     {
         if (item < 0 || item >= ItemCount())
             return false;
-        const int y = int(item - top) * rowHeight;
-        rect = automation::Rect{0, y, client.right, y + rowHeight};
+        const int y = int(item - top) * 20; // rows 20 pixels high
+        rect = automation::Rect{0, y, client.right, y + 20};
         return true;
     }
     bool CellRect(long item, int column, automation::Rect& rect) const override
@@ -87,7 +85,7 @@ struct FakeSource : automation::AutomationSource
         return true;
     }
     int ScrolledLeft() const override { return scrolledLeft; }
-    int ItemHeight(long) const override { return itemHeight; }
+    int ItemHeight(long) const override { return 18; }
     bool IsDroppedDown() const override { return dropped; }
     const automation::AutomationSource* Popup() const override { return popup; }
     automation::Rect ClientRect() const override { return client; }

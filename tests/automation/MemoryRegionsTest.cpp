@@ -1,8 +1,6 @@
 // Reading the process's memory map and checking pointers against it.
-#include "FakeAutomationSource.h"
-
-#include "platform/automation/AutomationText.h"
 #include "platform/automation/MemoryRegions.h"
+#include "platform/automation/AutomationText.h"
 
 #include <gtest/gtest.h>
 
