@@ -4,6 +4,7 @@
 // Python process, while another process writes the journals.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <sstream>
 #include <string>
@@ -129,19 +130,12 @@ protected:
 
 TEST_F(BusSessionTest, TheStatusTableReadsAsWrittenAndShowsTheSelectedRow)
 {
-    const std::vector<Row> jobs = {
-        {"41", "/srv/in/Proofs", "/srv/in/Proofs/a.pdf", "PRN-01", "1383035055", "Queued", "4096", "PDF"},
-        {"42", "/srv/in/Books", "/srv/in/Books/b.ps", "PRN-02", "1383035055", "Saving...", "8192",
-         "PostScript"},
-        {"43", "/srv/in/Proofs", "/srv/in/Proofs/c \u00e9t\u00e9.tif", "PRN-01", "1383035055",
-         "Converting file type", "2048", "TIFF"}};
-    for (const Row& job : jobs)
-    {
-        std::string line;
-        for (const std::string& field : job)
-            line += (line.empty() ? "" : "\t") + field;
+    for (const char* line :
+         {"41\t/srv/in/Proofs\t/srv/in/Proofs/a.pdf\tPRN-01\t1383035055\tQueued\t4096\tPDF",
+          "42\t/srv/in/Books\t/srv/in/Books/b.ps\tPRN-02\t1383035055\tSaving...\t8192\tPostScript",
+          "43\t/srv/in/Proofs\t/srv/in/Proofs/c \u00e9t\u00e9.tif\tPRN-01\t1383035055\tConverting file "
+          "type\t2048\tTIFF"})
         Journal("status", line);
-    }
     StartProgram();
 
     const Table table = Inspect("jobStatusList", 3);
@@ -149,19 +143,20 @@ TEST_F(BusSessionTest, TheStatusTableReadsAsWrittenAndShowsTheSelectedRow)
               (Row{"table", "jobStatusList", "Jobs in progress", "rows=3", "columns=8", "selected=-"}));
     EXPECT_EQ(table.headings,
               (Row{"No.", "File Name", "Format", "Hot Folder", "Server", "Size", "Time", "Status"}));
+    // Each job's row, whatever the order: the file's title, its format, folder, server and status, and
+    // the row's number.
+    const Row shown[] = {{"a", "PDF", "Proofs", "PRN-01", "Queued"},
+                         {"b", "PostScript", "Books", "PRN-02", "Saving..."},
+                         {"c \u00e9t\u00e9", "TIFF", "Proofs", "PRN-01", "Converting file type"}};
     ASSERT_EQ(table.cells.size(), 3u);
-    // Each job's row, whatever the order: its number, the file's title, its format, folder, server and
-    // status.
-    const char* const shown[][2] = {{"a", "Proofs"}, {"b", "Books"}, {"c \u00e9t\u00e9", "Proofs"}};
-    for (size_t job = 0; job < jobs.size(); ++job)
+    for (const Row& job : shown)
     {
-        size_t row = 0;
-        while (row < 3 && (table.cells[row].size() < 8 || table.cells[row][1] != shown[job][0]))
-            ++row;
-        ASSERT_LT(row, 3u) << "no row for " << shown[job][0];
-        const Row& cells = table.cells[row];
-        EXPECT_EQ((Row{cells[0], cells[2], cells[3], cells[4], cells[7]}),
-                  (Row{std::to_string(row + 1), jobs[job][7], shown[job][1], jobs[job][3], jobs[job][5]}));
+        const auto row =
+            std::find_if(table.cells.begin(), table.cells.end(),
+                         [&](const Row& cells) { return cells.size() >= 8 && cells[1] == job[0]; });
+        ASSERT_NE(row, table.cells.end()) << "no row for " << job[0];
+        EXPECT_EQ((Row{(*row)[1], (*row)[2], (*row)[3], (*row)[4], (*row)[7]}), job);
+        EXPECT_EQ((*row)[0], std::to_string(row - table.cells.begin() + 1));
     }
     EXPECT_EQ(ClickRow(table, "jobStatusList", 1).Selected(), "selected=1");
 }
@@ -178,13 +173,15 @@ TEST_F(BusSessionTest, TheLogTableReadsAsWrittenAndShowsTheSelectedRow)
     EXPECT_EQ(table.table,
               (Row{"table", "jobLogList", "Finished jobs", "rows=2", "columns=6", "selected=-"}));
     EXPECT_EQ(table.headings, (Row{" ", "File Name", "Hot Folder", "Server", "Start Time", "Status"}));
+    const Row shown[] = {{"a", "Proofs", "PRN-01", "Transferred Successfully"},
+                         {"b", "Books", "PRN-02", "Failed"}};
     ASSERT_EQ(table.cells.size(), 2u);
-    for (const Row& cells : table.cells)
+    for (size_t row = 0; row < 2; ++row)
+    {
+        const Row& cells = table.cells[row];
         ASSERT_GE(cells.size(), 6u);
-    EXPECT_EQ((Row{table.cells[0][1], table.cells[0][2], table.cells[0][3], table.cells[0][5]}),
-              (Row{"a", "Proofs", "PRN-01", "Transferred Successfully"}));
-    EXPECT_EQ((Row{table.cells[1][1], table.cells[1][2], table.cells[1][3], table.cells[1][5]}),
-              (Row{"b", "Books", "PRN-02", "Failed"}));
+        EXPECT_EQ((Row{cells[1], cells[2], cells[3], cells[5]}), shown[row]);
+    }
 
     // To the Log tab as a user goes there from the keyboard; its rows come on the screen.
     const XWindowAttributes frame = box.x.Attributes(window);
