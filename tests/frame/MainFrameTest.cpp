@@ -11,7 +11,6 @@
 #include "GuiTest.h"
 
 #include <gtest/gtest.h>
-#include <wx/dcmemory.h>
 #include <wx/display.h>
 #include <wx/imaglist.h>
 
@@ -89,14 +88,8 @@ TEST_F(MainFrameTest, TheNotebookFillsTheClientAreaAndFollowsResizes)
 TEST_F(MainFrameTest, DrawsTheTabsAndTheLabelInTheNotebookThemeColours)
 {
     const Theme& theme = Themer::GetThemeService()->GetTheme("Notebook");
-    wxBitmap bitmap(book->GetTabStrip()->GetClientSize());
-    {
-        wxMemoryDC dc(bitmap);
-        book->RenderTabStrip(dc);
-    }
-    const wxImage strip = bitmap.ConvertToImage();
-    auto pixel = [&](int x, int y)
-    { return wxColour(strip.GetRed(x, y), strip.GetGreen(x, y), strip.GetBlue(x, y)); };
+    const wxImage strip = RenderStrip(*book);
+    const auto pixel = [&](int x, int y) { return Pixel(strip, x, y); };
     const wxRect status = book->GetTabRects().at(0);
     const wxRect log = book->GetTabRects().at(1);
     EXPECT_EQ(pixel(status.GetRight() - 1, status.y + status.height / 2), theme.backgroundColour);

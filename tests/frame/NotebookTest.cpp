@@ -7,7 +7,6 @@
 #include "GuiTest.h"
 
 #include <gtest/gtest.h>
-#include <wx/dcmemory.h>
 #include <wx/frame.h>
 #include <wx/panel.h>
 
@@ -115,33 +114,17 @@ protected:
         return wxPoint(tab.GetRight() - 1, tab.y + tab.height / 2);
     }
 
-    // A key pressed while the focus is inside the current page, or on the strip.
-    void PressInPage(int key, int modifiers)
+    // A key pressed while the focus is inside the current page (wxEVT_CHAR_HOOK), or on the strip.
+    void Press(wxWindow* to, wxEventType type, int key, int modifiers = wxMOD_NONE)
     {
-        wxKeyEvent press(wxEVT_CHAR_HOOK);
+        wxKeyEvent press(type);
         press.m_keyCode = key;
         press.m_controlDown = (modifiers & wxMOD_CONTROL) != 0;
         press.m_shiftDown = (modifiers & wxMOD_SHIFT) != 0;
-        Send(book->GetCurrentPage(), press);
-    }
-    int PressOnStrip(int key)
-    {
-        wxKeyEvent down(wxEVT_KEY_DOWN);
-        down.m_keyCode = key;
-        Send(book->GetTabStrip(), down);
-        return book->GetSelection();
+        Send(to, press);
     }
 
-    wxColour PixelOfStrip(const wxPoint& at) const
-    {
-        wxBitmap bitmap(book->GetTabStrip()->GetClientSize());
-        {
-            wxMemoryDC dc(bitmap);
-            book->RenderTabStrip(dc);
-        }
-        const wxImage image = bitmap.ConvertToImage();
-        return wxColour(image.GetRed(at.x, at.y), image.GetGreen(at.x, at.y), image.GetBlue(at.x, at.y));
-    }
+    wxColour PixelOfStrip(const wxPoint& at) const { return Pixel(RenderStrip(*book), at.x, at.y); }
 
     wxFrame* frame = nullptr;
     TestNotebook* book = nullptr;
@@ -193,7 +176,7 @@ TEST_F(NotebookTest, ControlKeysInAPageCycleAndArrowsOnTheStripMoveWithoutWrappi
         for (int previous = 0, i = 0; selections[i]; previous = selections[i++] - '0')
         {
             events.clear();
-            PressInPage(key, modifiers);
+            Press(book->GetCurrentPage(), wxEVT_CHAR_HOOK, key, modifiers);
             const wxString step = wxString::Format("%d>%d", previous, selections[i] - '0');
             ASSERT_EQ(events, (std::vector<wxString>{"changing " + step, "changed " + step})) << key;
             EXPECT_TRUE(book->GetCurrentPage()->IsShown() && !book->GetPage(previous)->IsShown());
@@ -205,14 +188,17 @@ TEST_F(NotebookTest, ControlKeysInAPageCycleAndArrowsOnTheStripMoveWithoutWrappi
     events.clear();
     bool reachedFrame = false;
     frame->Bind(wxEVT_CHAR_HOOK, [&](wxKeyEvent& event) { reachedFrame = true, event.Skip(); });
-    PressInPage(WXK_TAB, wxMOD_NONE);
-    PressInPage(WXK_PAGEDOWN, wxMOD_SHIFT);
+    Press(book->GetCurrentPage(), wxEVT_CHAR_HOOK, WXK_TAB);
+    Press(book->GetCurrentPage(), wxEVT_CHAR_HOOK, WXK_PAGEDOWN, wxMOD_SHIFT);
     EXPECT_EQ(State(), "First*+ Second Third");
     EXPECT_TRUE(events.empty() && reachedFrame);
 
     for (const auto& [key, selection] :
          {std::pair{WXK_LEFT, 0}, {WXK_RIGHT, 1}, {WXK_END, 2}, {WXK_RIGHT, 2}, {WXK_HOME, 0}})
-        EXPECT_EQ(PressOnStrip(key), selection) << key;
+    {
+        Press(book->GetTabStrip(), wxEVT_KEY_DOWN, key);
+        EXPECT_EQ(book->GetSelection(), selection) << key;
+    }
 }
 
 // Which tab shows as selected is read back from the display below; here the
@@ -245,10 +231,7 @@ TEST_F(NotebookTest, ThePaintedStripShowsTheSelectedTabInItsColour)
     {
         const wxImage screen = GrabScreen(onScreen);
         const auto at = [&](int tab)
-        {
-            const wxPoint p = FillPoint(tabs[tab]);
-            return wxColour(screen.GetRed(p.x, p.y), screen.GetGreen(p.x, p.y), screen.GetBlue(p.x, p.y));
-        };
+        { return Pixel(screen, FillPoint(tabs[tab]).x, FillPoint(tabs[tab]).y); };
         return screen.IsOk() && at(selected) == kPage && at(idle) == kStrip;
     };
     // The toolkit paints on its own schedule.
