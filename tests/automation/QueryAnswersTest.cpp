@@ -119,9 +119,7 @@ struct ScalarCase
     std::optional<std::intptr_t> answer;
 };
 
-class ScalarTest : public ::testing::TestWithParam<ScalarCase>
-{
-};
+using ScalarTest = ::testing::TestWithParam<ScalarCase>;
 
 TEST_P(ScalarTest, Answers)
 {
@@ -185,9 +183,7 @@ struct KindCase
     const char16_t* written; // nullptr: the buffer is left as it was
 };
 
-class KindQueryTest : public ::testing::TestWithParam<KindCase>
-{
-};
+using KindQueryTest = ::testing::TestWithParam<KindCase>;
 
 TEST_P(KindQueryTest, AnswersTheKindNameWhenTheBufferHoldsItWithItsTerminator)
 {
@@ -269,9 +265,7 @@ struct RectCase
     std::array<int, 4> out;
 };
 
-class RectTest : public ::testing::TestWithParam<RectCase>
-{
-};
+using RectTest = ::testing::TestWithParam<RectCase>;
 
 TEST_P(RectTest, FillsTheRectangleOnlyForAPlaceOnTheScreen)
 {
@@ -336,9 +330,7 @@ struct ItemCase
     int width, format, image; // columns and header items: cx/cxy and fmt; the image
 };
 
-class ItemTest : public ::testing::TestWithParam<ItemCase>
-{
-};
+using ItemTest = ::testing::TestWithParam<ItemCase>;
 
 TEST_P(ItemTest, FillsTheAskedFieldsAndReportsOnlyThose)
 {
