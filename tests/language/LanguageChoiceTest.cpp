@@ -108,18 +108,6 @@ TEST_P(LanguageChoiceTest, ChoosesTheLanguage)
 INSTANTIATE_TEST_SUITE_P(Cases, LanguageChoiceTest, ::testing::ValuesIn(kCases),
                          [](const ::testing::TestParamInfo<ChoiceCase>& info) { return info.param.name; });
 
-TEST(LanguageFromServerFileTest, StartsFromUnknownAndSaysWhetherItDecided)
-{
-    wxInitializer init;
-    FakeSources sources;
-    int language = wxLANGUAGE_GERMAN;
-    EXPECT_FALSE(LanguageFromServerFile(sources, language));
-    EXPECT_EQ(language, wxLANGUAGE_UNKNOWN);
-    sources.serverFile = "serverlang=ko";
-    EXPECT_TRUE(LanguageFromServerFile(sources, language));
-    EXPECT_EQ(language, wxLANGUAGE_KOREAN_KOREA);
-}
-
 // Locale names as the environment gives them, to the Windows ids of the
 // program's table, and the row those ids lead back to; every row and every
 // supported language known to the library.
