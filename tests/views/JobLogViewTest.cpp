@@ -60,7 +60,7 @@ protected:
             logtest::SystemRoot::WriteFile(Marker(folder), "");
         Open(wxSize(1000, 600));
     }
-    wxWindow* RowsWindow() const override { return List()->GetMainWindow(); }
+    ProfilesKelvoProfilesListCtrl* Rows() const override { return List(); }
 
     static wxString Marker(const wxString& folder) { return folder + "/[_KELVO_HotFolder_]/Error.er"; }
 
@@ -72,19 +72,11 @@ protected:
         wxTheApp->ProcessPendingEvents();
     }
 
-    Texts Column(int column) const
-    {
-        Texts texts;
-        for (long row = 0; row < List()->GetItemCount(); ++row)
-            texts.push_back(List()->GetItemText(row, column));
-        return texts;
-    }
     void Select(long row, bool on = true)
     {
         List()->SetItemState(row, on ? wxLIST_STATE_SELECTED : 0, wxLIST_STATE_SELECTED);
         wxTheApp->ProcessPendingEvents();
     }
-    void Send(wxEvent& event) { List()->GetEventHandler()->ProcessEvent(event); }
 
     ProfilesKelvoProfilesListCtrl* List() const { return view->GetLogList(); }
     bool DetailShown() const { return view->GetErrorPanel()->IsShown(); }
@@ -131,9 +123,7 @@ TEST_F(LogView, JournalLinesBecomeRowsAtTheEndWhateverTheSort)
             LogLine("b", "ADDED", "Failed", folders[1]));
     ASSERT_EQ(Column(1), (Texts{"a", "b"}));
     // The first click on "File Name" sorts descending.
-    wxListEvent click(wxEVT_LIST_COL_CLICK, JobLogView::kLogListId);
-    click.m_col = 1;
-    Send(click);
+    SendList(wxEVT_LIST_COL_CLICK, 1);
     ASSERT_EQ(Column(1), (Texts{"b", "a"}));
 
     // Two polls before the view's turn: two updates queued, each row once.
@@ -190,12 +180,8 @@ TEST_F(LogView, DetailPanelShowsOnlyWhileAFailedRowIsSelected)
     Select(0);
     EXPECT_FALSE(DetailShown());
     // Events for no row in particular (index -1), and a click beside the last column.
-    wxListEvent many(wxEVT_LIST_ITEM_SELECTED, JobLogView::kLogListId);
-    many.m_itemIndex = -1;
-    Send(many);
-    wxListEvent beside(wxEVT_LIST_COL_CLICK, JobLogView::kLogListId);
-    beside.m_col = -2;
-    Send(beside);
+    SendList(wxEVT_LIST_ITEM_SELECTED, 0, -1);
+    SendList(wxEVT_LIST_COL_CLICK, -2);
     EXPECT_FALSE(DetailShown());
     EXPECT_EQ(Column(1), (Texts{"ok", "bad", "later"}));
 

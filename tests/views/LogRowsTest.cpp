@@ -12,19 +12,11 @@ namespace
 {
 using logrows::LogFilter;
 
+// In LogField order: key, file, folder, server, time, status, detail, DosTime.
 JobRecord Record(const wxString& key, const wxString& folder, const wxString& file, const wxString& status,
                  const wxString& dosTime = "1")
 {
-    JobRecord record;
-    record[LogField::Key] = key;
-    record[LogField::FilePath] = file;
-    record[LogField::HotFolderPath] = folder;
-    record[LogField::Server] = "PRN-01";
-    record[LogField::TimeText] = "15.03.2021 14:05:30";
-    record[LogField::Status] = status;
-    record[LogField::Detail] = "detail";
-    record[LogField::DosTime] = dosTime;
-    return record;
+    return {key, file, folder, "PRN-01", "15.03.2021 14:05:30", status, "detail", dosTime};
 }
 
 wxString Marked(const wxString& text)

@@ -40,7 +40,7 @@ protected:
                                           "[Servers]\nsrv1\nsrv2\nSRV3\n");
         Open(wxSize(1100, 500));
     }
-    wxWindow* RowsWindow() const override { return List()->GetMainWindow(); }
+    ProfilesKelvoProfilesListCtrl* Rows() const override { return List(); }
 
     // Rewrites the journal, polls, and hands the view its update event.
     void Produce(const wxString& lines)
@@ -50,13 +50,6 @@ protected:
         wxTheApp->ProcessPendingEvents();
     }
 
-    Texts Column(long column) const
-    {
-        Texts texts;
-        for (long row = 0; row < List()->GetItemCount(); ++row)
-            texts.push_back(List()->OnGetItemText(row, column));
-        return texts;
-    }
     int Mark(int column) const
     {
         wxListItem info;
@@ -65,13 +58,7 @@ protected:
     }
     long Selected() const { return List()->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED); }
 
-    void ClickColumn(int column)
-    {
-        wxListEvent event(wxEVT_LIST_COL_CLICK, List()->GetId());
-        event.SetEventObject(List());
-        event.m_col = column;
-        List()->GetEventHandler()->ProcessEvent(event);
-    }
+    void ClickColumn(int column) { SendList(wxEVT_LIST_COL_CLICK, column); }
     void PressServerBox()
     {
         wxCommandEvent press(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK);
