@@ -1,5 +1,6 @@
-// Every image built into the program decodes to the size and kind its users
-// expect, damaged data gives an invalid bitmap instead of a crash, and the
+// Every image built into the program decodes, the icons are see-through
+// around their drawing, the sort marks and the wheel frames show what they
+// mean, damaged data gives an invalid bitmap instead of a crash, and the
 // window icon file lies beside the program.
 #include "resources/EmbeddedImages.h"
 #include "platform/ui/BitmapFromMemory.h"
