@@ -3,7 +3,7 @@
 // A program started as a user starts it, in a folder of its own: a private
 // system root, home and runtime folder, an environment without the build's
 // library folder in it, and the display its window goes to. Shared by the
-// install, language and accessibility-bus process tests.
+// install and accessibility-bus process tests.
 // Include after GoogleTest (see ProgramSession.h).
 #include <sys/stat.h>
 
