@@ -362,11 +362,7 @@ TEST_P(ItemTest, FillsTheAskedFieldsAndReportsOnlyThose)
     else
     {
         auto* item = f.At<HDITEMW>(0);
-        *item = HDITEMW{};
-        item->mask = c.mask;
-        item->pszText = text;
-        item->cchTextMax = capacity;
-        item->iImage = -5;
+        *item = HDITEMW{c.mask, 0, text, nullptr, capacity, 0, 0, -5};
         answer = f.Ask(c.message, std::uintptr_t(c.item), f.Address(0));
         std::tie(maskBack, width, format, image) = std::tuple(item->mask, item->cxy, item->fmt, item->iImage);
     }
