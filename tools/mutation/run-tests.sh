@@ -10,7 +10,7 @@ if [ "$1" = --display ]; then
     shift
     exec xvfb-run -a -s '-screen 0 1280x1024x24' "$0" "$@"
 fi
-ALONE=${ALONE:-IconRefreshSetting.ComesFromTheConfigurationOnEveryUse}
+ALONE=${ALONE:-IconRefreshSetting.ComesFromTheConfigurationOnEveryUse:FolderErrors.TheSettingComesFromTheConfiguration}
 LIMIT=${LIMIT:-60}
 for b in "$@"; do
     timeout -k 5 "$LIMIT" ./bin/$b --gtest_filter="-*BesideAProducerProcess*:SystemRoot.ARelativeRoot*:$ALONE" >/dev/null 2>&1 ||

@@ -19,11 +19,11 @@ cd "$checkout" || exit 1
 common="--build build --max 40 --seed 15"
 for area in "$@"; do
     case $area in
-    pump) python3 "$tool" $common --timeout 75 $(targets $pump) --ctest "-N >/dev/null && $run $pump" pump/*.cpp ;;
-    list) python3 "$tool" $common --timeout 75 $(targets $list) --ctest "-N >/dev/null && $run --display $list" \
+    pump) python3 "$tool" $common --timeout 75 $(targets $pump) --ctest "-N >/dev/null 2>&1; $run $pump" pump/*.cpp ;;
+    list) python3 "$tool" $common --timeout 75 $(targets $list) --ctest "-N >/dev/null 2>&1; $run --display $list" \
               components/Utility/*.cpp ;;
-    os) python3 "$tool" $common --timeout 120 --target wyx_os --ctest "-N >/dev/null && $run $unit" platform/os/*.cpp ;;
-    data) python3 "$tool" $common --timeout 120 $(targets $unit) --ctest "-N >/dev/null && $run $unit" data/*.cpp ;;
+    os) python3 "$tool" $common --timeout 120 --target wyx_os --ctest "-N >/dev/null 2>&1; $run $unit" platform/os/*.cpp ;;
+    data) python3 "$tool" $common --timeout 120 $(targets $unit) --ctest "-N >/dev/null 2>&1; $run $unit" data/*.cpp ;;
     *) echo "unknown area: $area" >&2; exit 2 ;;
     esac > "$out-$area.log" 2>&1
 done
