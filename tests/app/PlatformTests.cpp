@@ -1,17 +1,27 @@
-// The crash reporter loader, the log folder, the system root and the heap.
+// The crash reporter loader, the log folder, the system root, the heap, files,
+// locks and the second copy's signal.
 #include <stdlib.h>
+#include <sys/stat.h>
+#include <time.h>
 #include <unistd.h>
 
+#include <atomic>
+#include <chrono>
 #include <fstream>
 #include <memory>
 #include <sstream>
+#include <thread>
 #include <vector>
 
 #include <gtest/gtest.h>
 
 #include "TempFolder.h"
 #include "app/CrashReporterLoader.h"
+#include "platform/os/FileContents.h"
+#include "platform/os/FileLock.h"
 #include "platform/os/HeapTuning.h"
+#include "platform/os/InstanceLock.h"
+#include "platform/os/InstanceSignal.h"
 #include "platform/os/SystemPaths.h"
 #include "platform/services/WyxLogger.h"
 
@@ -135,6 +145,112 @@ TEST(SystemRoot, ARelativeRootIsResolvedOnceAgainstTheStartingFolder)
         EXPECT_EQ(wyxos::SystemRoot(), expected) << (given ? given : "unset");
     }
     std::filesystem::current_path(started);
+}
+
+TEST(FileContents, TellsAMissingFileFromOneThatCannotBeReadAndReadsNoMoreThanAsked)
+{
+    TempFolder folder;
+    std::string bytes = "kept";
+    EXPECT_EQ(wyxos::ReadFileContents((folder.Path() / "absent").string(), bytes),
+              wyxos::ReadResult::Missing);
+    EXPECT_EQ(wyxos::ReadFileContents((folder.Path() / "absent/below").string(), bytes),
+              wyxos::ReadResult::Missing);
+    EXPECT_EQ(wyxos::ReadFileContents(folder.Path().string(), bytes), wyxos::ReadResult::Unreadable);
+    EXPECT_EQ(bytes, "kept");
+    const auto file = folder.Write("file", "0123456789");
+    ASSERT_EQ(wyxos::ReadFileContents(file.string(), bytes, 4), wyxos::ReadResult::Read);
+    EXPECT_EQ(bytes, "0123");
+}
+
+// As root: a rewrite keeps the group of a file whose owner is the writer.
+TEST(FileContents, ARewriteKeepsTheGroupOfTheWritersOwnFile)
+{
+    if (::geteuid() != 0)
+        GTEST_SKIP() << "only root may give a file to another group";
+    TempFolder folder;
+    const auto file = folder.Write("journal", "old");
+    ASSERT_EQ(::chown(file.c_str(), 0, 1), 0);
+    ASSERT_TRUE(wyxos::ReplaceFileContents(file.string(), "new"));
+    struct stat info;
+    ASSERT_EQ(::stat(file.c_str(), &info), 0);
+    EXPECT_EQ(info.st_gid, 1u);
+}
+
+double ThreadCpuSeconds()
+{
+    timespec now{};
+    ::clock_gettime(CLOCK_THREAD_CPUTIME_ID, &now);
+    return now.tv_sec + now.tv_nsec / 1e9;
+}
+
+// A reader waiting for the producer's lock must leave the processor to it.
+TEST(FileLock, AWaitForAHeldLockSleepsAndEndsWhenToldTo)
+{
+    TempFolder folder;
+    ScopedEnv root("WYX_SYSTEM_ROOT", folder.Path().string());
+    const int holder = wyxos::OpenLockFile("held"), waiter = wyxos::OpenLockFile("held");
+    ASSERT_TRUE(wyxos::TryLockFile(holder));
+    EXPECT_FALSE(wyxos::TryLockFile(waiter));
+    std::atomic<bool> keepWaiting{true};
+    std::atomic<int> passes{0};
+    double cpu = 0, wall = 0;
+    std::thread waiting(
+        [&]
+        {
+            const auto start = std::chrono::steady_clock::now();
+            const double cpuStart = ThreadCpuSeconds();
+            passes = wyxos::LockFile(waiter, &keepWaiting) ? 2 : 1;
+            cpu = ThreadCpuSeconds() - cpuStart;
+            wall = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+        });
+    // Long enough for a spinning wait to show in the thread's processor time.
+    std::this_thread::sleep_for(std::chrono::milliseconds(300));
+    keepWaiting = false;
+    waiting.join();
+    EXPECT_EQ(passes, 1) << "gave up without the lock";
+    EXPECT_LT(cpu, wall / 4) << "the wait spun: " << cpu << " s of processor in " << wall << " s";
+    wyxos::UnlockFile(holder);
+    EXPECT_TRUE(wyxos::LockFile(waiter, &keepWaiting)) << "a free lock is taken even when no longer waiting";
+    wyxos::CloseLockFile(holder);
+    wyxos::CloseLockFile(waiter);
+}
+
+template <typename Done> bool WaitFor(Done done)
+{
+    for (int i = 0; i < 10000 && !done(); ++i)
+        std::this_thread::sleep_for(std::chrono::milliseconds(1));
+    return done();
+}
+
+// One copy per user: the lock and the knock live in the user's own runtime folder.
+TEST(SecondCopy, FindsTheFirstThroughItsRuntimeFolderAndKnocksOnlyOnIt)
+{
+    TempFolder runtime, home;
+    ScopedEnv runtimeDir("XDG_RUNTIME_DIR", runtime.Path().string());
+    ScopedEnv homeDir("HOME", home.Path().string());
+    EXPECT_EQ(wyxos::InstanceLock::FolderFor(), wxString(runtime.Path().string()));
+    {
+        ScopedEnv relative("XDG_RUNTIME_DIR", "relative");
+        EXPECT_EQ(wyxos::InstanceLock::FolderFor(), wxString(home.Path().string()));
+    }
+    wyxos::InstanceLock first("wyx-copy");
+    EXPECT_FALSE(first.IsAnotherRunning());
+    EXPECT_TRUE(wyxos::InstanceLock("wyx-copy").IsAnotherRunning());
+    EXPECT_FALSE(wyxos::InstanceLock("wyx-other").IsAnotherRunning());
+
+    std::atomic<int> knocksOnA{0}, knocksOnB{0};
+    {
+        wyxos::InstanceSignal a("a", [&] { ++knocksOnA; }), b("b", [&] { ++knocksOnB; });
+        ASSERT_TRUE(a.IsListening());
+        ASSERT_TRUE(b.IsListening()) << "two names, two sockets";
+        EXPECT_TRUE(std::filesystem::exists(runtime.Path() / "a.sock"));
+        EXPECT_TRUE(wyxos::InstanceSignal::Knock("a"));
+        EXPECT_TRUE(WaitFor([&] { return knocksOnA == 1; }));
+        EXPECT_FALSE(wyxos::InstanceSignal::Knock("c"));
+    }
+    EXPECT_EQ(knocksOnB, 0);
+    EXPECT_FALSE(std::filesystem::exists(runtime.Path() / "a.sock")) << "the socket goes with its listener";
+    EXPECT_FALSE(wyxos::InstanceSignal::Knock("a"));
 }
 
 long ResidentKiB()

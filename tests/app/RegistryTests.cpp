@@ -54,6 +54,8 @@ INSTANTIATE_TEST_SUITE_P(
                   "/opt/with space"},
         ParseCase{"[SOFTWARE\\Kelvo Systems\\ CrashReporter]\nInstallPath=/x\n", kCrashKey, "InstallPath",
                   nullptr},
+        ParseCase{"[ SOFTWARE\\Kelvo Systems\\CrashReporter ]\nInstallPath=/x\n", kCrashKey, "InstallPath",
+                  "/x"},
         ParseCase{kCrash + "InstallPath=\n", kCrashKey, "InstallPath", ""},
         ParseCase{kCrash + "InstallPath=/a=b\n", kCrashKey, "InstallPath", "/a=b"},
         ParseCase{kCrash + "InstallPath=/a\nInstallPath=/b\n", kCrashKey, "InstallPath", "/b"},
