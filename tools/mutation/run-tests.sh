@@ -1,7 +1,7 @@
 #!/bin/bash
 # Runs whole test binaries from the current build folder, one process each, and stops at the first
 # failure: much cheaper than one process per test, which is what makes a mutation sample affordable.
-# Tests named in ALONE change process-wide state and run in a process of their own; the producer soak and
+# Tests named in ALONE change process-wide state and run in a process of their own; the producer soak
 # is left to ctest.
 # A binary that runs past LIMIT seconds is ended (a change that makes a test hang counts as caught), so
 # that no hung test process outlives the run.
