@@ -4,7 +4,6 @@
 #include "views/JobLogView.h"
 
 #include "components/Utility/ImageTextButton.h"
-#include "components/Utility/profilescustomlistctrl.h"
 #include "data/JobLogManager.h"
 #include "data/NamedMutex.h"
 #include "views/ErrorWndBkgLog.h"
@@ -12,7 +11,6 @@
 #include "../log/LogTestSupport.h"
 #include "ViewTest.h"
 
-#include <wx/listctrl.h>
 #include <wx/modalhook.h>
 #include <wx/msgdlg.h>
 #include <wx/radiobut.h>
@@ -23,7 +21,8 @@ namespace
 {
 using logtest::LogLine;
 
-// Answers the message boxes in place of a person and notes what they said.
+// Answers the message boxes in place of a person and notes what they said;
+// a box nobody expected is cancelled and shows in the notes.
 class DialogScript : public wxModalDialogHook
 {
 public:
@@ -35,7 +34,6 @@ protected:
     int Enter(wxDialog* dialog) override
     {
         messages.push_back(static_cast<wxMessageDialog*>(dialog)->GetMessage());
-        EXPECT_FALSE(answers.empty()) << "unexpected dialog: " << messages.back();
         const int answer = answers.empty() ? wxID_CANCEL : answers.front();
         if (!answers.empty())
             answers.pop_front();
@@ -60,8 +58,7 @@ protected:
             logtest::SystemRoot::WriteFile(Marker(folder), "");
         Open(wxSize(1000, 600));
     }
-    ProfilesKelvoProfilesListCtrl* Rows() const override { return List(); }
-
+    ProfilesKelvoProfilesListCtrl* Rows() const override { return view->GetLogList(); }
     static wxString Marker(const wxString& folder) { return folder + "/[_KELVO_HotFolder_]/Error.er"; }
 
     // Appends journal lines, polls, and hands the view its update event.
@@ -71,17 +68,13 @@ protected:
         model.Refresh();
         wxTheApp->ProcessPendingEvents();
     }
-
     void Select(long row, bool on = true)
     {
-        List()->SetItemState(row, on ? wxLIST_STATE_SELECTED : 0, wxLIST_STATE_SELECTED);
+        Rows()->SetItemState(row, on ? wxLIST_STATE_SELECTED : 0, wxLIST_STATE_SELECTED);
         wxTheApp->ProcessPendingEvents();
     }
-
-    ProfilesKelvoProfilesListCtrl* List() const { return view->GetLogList(); }
     bool DetailShown() const { return view->GetErrorPanel()->IsShown(); }
     wxRadioButton* Radio(wxWindowID id) const { return wxDynamicCast(view->FindWindow(id), wxRadioButton); }
-
     void Choose(wxWindowID radio)
     {
         Radio(radio)->SetValue(true);
@@ -91,7 +84,6 @@ protected:
         Radio(radio)->GetEventHandler()->ProcessEvent(event);
         wxTheApp->ProcessPendingEvents();
     }
-
     // As the button reports a press: queued to the view, with the button's id.
     void PressClearAll()
     {
@@ -99,11 +91,6 @@ protected:
             new wxCommandEvent(wxEVT_IMAGE_TEXT_BUTTON_CLICK, JobLogView::kClearAllId));
         wxTheApp->ProcessPendingEvents();
     }
-    void WaitForClear()
-    {
-        ASSERT_TRUE(guitest::PumpUntil([this] { return !view->IsClearing(); }));
-    }
-
     // What a clear must leave alone: rows, footer, detail, records, journal and markers.
     wxString Kept() const
     {
@@ -117,15 +104,13 @@ protected:
     wxArrayString folders;
 };
 
-TEST_F(LogView, JournalLinesBecomeRowsAtTheEndWhateverTheSort)
+TEST_F(LogView, NewRowsComeAtTheEndWhateverTheSortAndAFailedRowSelectedShowsItsDetail)
 {
     Produce(LogLine("a", "ADDED", "Transferred Successfully", folders[0]) +
             LogLine("b", "ADDED", "Failed", folders[1]));
     ASSERT_EQ(Column(1), (Texts{"a", "b"}));
-    // The first click on "File Name" sorts descending.
-    SendList(wxEVT_LIST_COL_CLICK, 1);
+    SendList(wxEVT_LIST_COL_CLICK, 1); // the first click on "File Name" sorts descending
     ASSERT_EQ(Column(1), (Texts{"b", "a"}));
-
     // Two polls before the view's turn: two updates queued, each row once.
     logtest::SystemRoot::AppendFile(root.JournalPath(), LogLine("c", "ADDED", "Failed", folders[0]));
     model.Refresh();
@@ -137,18 +122,44 @@ TEST_F(LogView, JournalLinesBecomeRowsAtTheEndWhateverTheSort)
         wxListItem warning;
         warning.SetId(row);
         warning.SetMask(wxLIST_MASK_IMAGE);
-        ASSERT_TRUE(List()->GetItem(warning));
+        ASSERT_TRUE(Rows()->GetItem(warning));
         EXPECT_EQ(warning.GetImage(), image) << row;
     }
     EXPECT_EQ(Footer(), "4 Items");
+
+    Select(2);
+    EXPECT_TRUE(DetailShown());
+    EXPECT_EQ(view->GetErrorPanel()->GetErrorText(), "detail of c");
+    EXPECT_GT(view->GetErrorPanel()->GetSize().GetHeight(), 0);
+    Produce(LogLine("later", "ADDED", "Transferred Successfully", folders[0]));
+    EXPECT_TRUE(DetailShown()) << "a job finishing meanwhile leaves the detail being read";
+    EXPECT_EQ(Footer(), "1 of 5 items selected.");
+    Select(1);
+    EXPECT_FALSE(DetailShown());
+    // Events for no row in particular (index -1), and a click beside the last column.
+    SendList(wxEVT_LIST_ITEM_SELECTED, 0, -1);
+    SendList(wxEVT_LIST_COL_CLICK, -2);
+    EXPECT_FALSE(DetailShown());
+    EXPECT_EQ(Column(1), (Texts{"b", "a", "c", "d", "later"}));
+    Select(1, false);
+    EXPECT_EQ(Footer(), "5 Items");
 }
 
-TEST_F(LogView, ErrorLogHidesSuccessesAndAcknowledgesTheShownFolders)
+TEST_F(LogView, ErrorLogHidesSuccessesAcknowledgesTheShownFoldersAndColumnsShowTheLongestTextsWhole)
 {
+    // The last one on 28 December 2107, 23:58:58: two-digit day and month, the latest hour.
     Produce(LogLine("ok", "ADDED", "Transferred Successfully", folders[0]) +
             LogLine("ok2", "ADDED", "Transferred Successfully  ", folders[1]) +
-            LogLine("case", "ADDED", "transferred successfully", folders[1]));
-    ASSERT_EQ(List()->GetItemCount(), 3);
+            LogLine("case", "ADDED", "transferred successfully", folders[1]) + "k\t" + folders[0] + "\t" +
+            folders[0] + "/k.pdf\tPRN-01\t4288462685\tTransferred Successfully\tdone\tADDED\r\n");
+    ASSERT_EQ(Rows()->GetItemCount(), 4);
+    // The list draws a cell's text shortened when it is wider than the column less 8.
+    for (const int column : {4, 5})
+    {
+        const wxString text = Rows()->GetItemText(3, column);
+        EXPECT_LE(Rows()->GetMainWindow()->GetTextExtent(text).GetWidth(), Rows()->GetColumnWidth(column) - 8)
+            << text << " in a column " << Rows()->GetColumnWidth(column) << " wide";
+    }
     EXPECT_TRUE(wxFileExists(Marker(folders[0])));
 
     Choose(JobLogView::kErrorLogId);
@@ -157,53 +168,9 @@ TEST_F(LogView, ErrorLogHidesSuccessesAndAcknowledgesTheShownFolders)
     // Every folder of the log, even one with successes only; not the idle one.
     for (int i = 0; i < 3; ++i)
         EXPECT_EQ(wxFileExists(Marker(folders[i])), i == 2) << folders[i];
-
     Choose(JobLogView::kCompleteLogId);
-    EXPECT_EQ(List()->GetItemCount(), 3);
+    EXPECT_EQ(Rows()->GetItemCount(), 4);
     EXPECT_FALSE(Radio(JobLogView::kErrorLogId)->GetValue());
-}
-
-TEST_F(LogView, DetailPanelShowsOnlyWhileAFailedRowIsSelected)
-{
-    Produce(LogLine("ok", "ADDED", "Transferred Successfully", folders[0]) +
-            LogLine("bad", "ADDED", "Failed", folders[0]));
-    ASSERT_FALSE(DetailShown());
-    Select(1);
-    EXPECT_TRUE(DetailShown());
-    EXPECT_EQ(view->GetErrorPanel()->GetErrorText(), "detail of bad");
-    EXPECT_GT(view->GetErrorPanel()->GetSize().GetHeight(), 0);
-    EXPECT_EQ(Footer(), "1 of 2 items selected.");
-    Produce(LogLine("later", "ADDED", "Transferred Successfully", folders[0]));
-    EXPECT_TRUE(DetailShown()) << "a job finishing meanwhile leaves the detail being read";
-    EXPECT_EQ(Footer(), "1 of 3 items selected.");
-
-    Select(0);
-    EXPECT_FALSE(DetailShown());
-    // Events for no row in particular (index -1), and a click beside the last column.
-    SendList(wxEVT_LIST_ITEM_SELECTED, 0, -1);
-    SendList(wxEVT_LIST_COL_CLICK, -2);
-    EXPECT_FALSE(DetailShown());
-    EXPECT_EQ(Column(1), (Texts{"ok", "bad", "later"}));
-
-    Select(0, false);
-    EXPECT_EQ(Footer(), "3 Items");
-}
-
-TEST_F(LogView, ColumnsShowTheLongestTextsWhole)
-{
-    // 28 December 2107, 23:58:58: two-digit day and month, the latest hour.
-    const unsigned long date = ((2107 - 1980) << 9) | (12 << 5) | 28;
-    const unsigned long time = (23 << 11) | (58 << 5) | (58 / 2);
-    Produce("k\t" + folders[0] + "\t" + folders[0] + "/k.pdf\tPRN-01\t" +
-            wxString::Format("%lu", (date << 16) | time) + "\tTransferred Successfully\tdone\tADDED\r\n");
-    ASSERT_EQ(List()->GetItemCount(), 1);
-    // The list draws a cell's text shortened when it is wider than the column less 8.
-    for (const int column : {4, 5})
-    {
-        const wxString text = List()->GetItemText(0, column);
-        EXPECT_LE(List()->GetMainWindow()->GetTextExtent(text).GetWidth(), List()->GetColumnWidth(column) - 8)
-            << text << " in a column " << List()->GetColumnWidth(column) << " wide";
-    }
 }
 
 TEST_F(LogView, ClearAllWhileTheProducerHoldsTheLogChangesNothingAndSaysSoThenClearsOnceFree)
@@ -211,6 +178,7 @@ TEST_F(LogView, ClearAllWhileTheProducerHoldsTheLogChangesNothingAndSaysSoThenCl
     {
         DialogScript script({});
         PressClearAll(); // an empty log: nothing to ask
+        EXPECT_TRUE(script.messages.empty());
     }
     Produce(LogLine("bad", "ADDED", "Failed", folders[0]) +
             LogLine("ok", "ADDED", "Transferred Successfully"));
@@ -233,7 +201,7 @@ TEST_F(LogView, ClearAllWhileTheProducerHoldsTheLogChangesNothingAndSaysSoThenCl
         // events while the producer keeps the lock.
         EXPECT_TRUE(view->IsClearing());
         EXPECT_EQ(script.messages, (Texts{kConfirmation}));
-        WaitForClear();
+        ASSERT_TRUE(guitest::PumpUntil([this] { return !view->IsClearing(); }));
         EXPECT_EQ(script.messages, (Texts{kConfirmation, kInUse}));
         EXPECT_EQ(Kept(), before);
     }
@@ -241,7 +209,7 @@ TEST_F(LogView, ClearAllWhileTheProducerHoldsTheLogChangesNothingAndSaysSoThenCl
     producer.unlock();
     DialogScript script({wxID_YES});
     PressClearAll();
-    WaitForClear();
+    ASSERT_TRUE(guitest::PumpUntil([this] { return !view->IsClearing(); }));
     EXPECT_EQ(script.messages, (Texts{kConfirmation}));
     EXPECT_EQ(Kept(), "|0 Items ||0|0|");
     for (const wxString& folder : folders)
@@ -259,7 +227,6 @@ TEST_F(LogView, ViewClosedWhileAClearWaitsGetsNoResult)
     DialogScript script({wxID_YES});
     PressClearAll();
     ASSERT_TRUE(view->IsClearing());
-
     frame->Destroy();
     ASSERT_TRUE(guitest::PumpUntil([&] { return !wxTheApp->IsScheduledForDestruction(frame); }));
     wxTheApp->ProcessPendingEvents();

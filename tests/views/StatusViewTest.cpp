@@ -58,7 +58,6 @@ protected:
     }
     long Selected() const { return List()->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED); }
 
-    void ClickColumn(int column) { SendList(wxEVT_LIST_COL_CLICK, column); }
     void PressServerBox()
     {
         wxCommandEvent press(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK);
@@ -90,62 +89,43 @@ protected:
     CustomListCtrl* List() const { return view->GetJobList(); }
 };
 
-TEST_F(StatusView, TheServerListFollowsTheDataSourceAndTheFilterHoldsAcrossUpdates)
+TEST_F(StatusView, RowsFollowTheJournalTheSortAndTheServerChosenAndTheSelectionStaysWithItsJob)
 {
+    EXPECT_EQ(Mark(1), 0) << "File Name is sorted ascending before any click";
     PressServerBox();
     EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv1,srv2,SRV3", ','));
     statustest::SystemRoot::WriteFile(GetDataDirectory() + "HotFolders.ini", "[Servers]\nsrv1\nsrv2\n");
     PressServerBox();
     EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv1,srv2", ','));
 
-    Produce(Line("a", "srv1") + Line("b", "SRV1 ") + Line("c", "srv2"));
-    ChooseServer("srv1");
-    EXPECT_EQ(Column(1), (Texts{"a", "b"}));
-    EXPECT_EQ(Footer(), "2 Items ");
-    Produce(Line("a", "srv1") + Line("d", "srv2"));
-    EXPECT_EQ(Column(1), (Texts{"a"})) << "the filter holds across updates";
-    ChooseServer("All Servers      ");
-    EXPECT_EQ(Column(1), (Texts{"a", "d"}));
-    EXPECT_EQ(Footer(), "2 Items ");
-}
-
-TEST_F(StatusView, RowsComeInFileNameOrderAndColumnClicksFlipTheOrderAndTheMark)
-{
-    EXPECT_EQ(Footer(), "0 Items ");
-    EXPECT_EQ(Mark(1), 0) << "File Name is sorted ascending before any click";
-    Produce(Line("b", "srv3", "Queued", "1383035000") + Line("C", "srv1", "Saving...", "1383036000") +
-            Line("a", "srv2", "Queued", "1383035100"));
+    Produce(Line("b", "srv1", "Queued", "1383035000") + Line("C", "srv2", "Saving...", "1383036000") +
+            Line("a", "SRV1 ", "Queued", "1383035100"));
     EXPECT_EQ(Column(1), (Texts{"a", "b", "C"}));
     EXPECT_EQ(Column(0), (Texts{"1", "2", "3"}));
     EXPECT_EQ(Footer(), "3 Items ");
-    ClickColumn(4);
-    EXPECT_EQ(Column(4), (Texts{"srv3", "srv2", "srv1"}));
-    EXPECT_EQ(Mark(4), 1);
-    EXPECT_EQ(Mark(1), -1);
+    List()->SetItemState(1, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
+    SendList(wxEVT_LIST_COL_CLICK, 6); // Time: the first click sorts descending
+    EXPECT_EQ(Column(1), (Texts{"C", "a", "b"}));
+    EXPECT_EQ(Mark(6) * 10 + Mark(1), 10 - 1);
     // A second click flips; negative and zero columns sort nothing.
-    for (int column : {4, 0, -1})
+    for (int column : {6, 0, -1})
     {
-        ClickColumn(column);
-        EXPECT_EQ(Column(4), (Texts{"srv1", "srv2", "srv3"})) << column;
-        EXPECT_EQ(Mark(4), 0) << column;
+        SendList(wxEVT_LIST_COL_CLICK, column);
+        EXPECT_EQ(Column(1), (Texts{"b", "a", "C"})) << column;
+        EXPECT_EQ(Mark(6), 0) << column;
     }
-    Produce(Line("a", "srv2", "Queued", "1383035100") + Line("d", "srv1", "Queued", "1383099000"));
-    EXPECT_EQ(Column(1), (Texts{"d", "a"})) << "an update keeps the sort";
-    EXPECT_EQ(Footer(), "2 Items ");
-}
-
-TEST_F(StatusView, TheSelectedJobStaysSelectedUntilItLeaves)
-{
-    Produce(Line("b", "srv1") + Line("c", "srv1"));
-    List()->SetItemState(0, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
-    Produce(Line("a", "srv1") + Line("b", "srv1") + Line("c", "srv1") + Line("x", "srv2"));
-    EXPECT_EQ(Selected(), 1) << "b moved down a row and the selection with it";
-    ClickColumn(1);
-    EXPECT_EQ(Column(1)[Selected()], "b") << "after a re-sort";
+    EXPECT_EQ(Selected(), 0) << "the selection moves with its job";
     ChooseServer("srv1");
-    EXPECT_EQ(Column(1)[Selected()], "b") << "after a filter change";
-    Produce(Line("a", "srv1") + Line("c", "srv1"));
+    EXPECT_EQ(Column(1), (Texts{"b", "a"}));
+    EXPECT_EQ(Footer(), "2 Items ");
+    Produce(Line("a", "srv1 ", "Queued", "1383035100") + Line("b", "srv1", "Queued", "1383035000") +
+            Line("d", "srv1", "Queued", "1383034000") + Line("e", "srv2"));
+    EXPECT_EQ(Column(1), (Texts{"d", "b", "a"})) << "the filter and the sort hold across updates";
+    EXPECT_EQ(Selected(), 1);
+    Produce(Line("a", "srv1", "Queued", "1383035100") + Line("e", "srv2"));
     EXPECT_EQ(Selected(), -1) << "a job that left the journal left the selection";
+    ChooseServer("All Servers      ");
+    EXPECT_EQ(Column(1), (Texts{"e", "a"}));
 }
 
 TEST_F(StatusView, ATickTurnsTheWheelOfRowsInProgressOnly)

@@ -18,69 +18,27 @@ using Order = std::vector<std::size_t>;
 
 TEST(ViewRules, FormatSizeShowsBytesInTheLargestUnitExceeded)
 {
-    for (const auto& [bytes, shown] : {std::pair{"2048", "2.00KB"},
-                                       {"0", "0.00KB"},
-                                       {"1048576", "1024.00KB"},
-                                       {"1048577", "1.00MB"},
-                                       {"1073741824", "1024.00MB"},
-                                       {"1073741825", "1.00GB"},
-                                       {"5368709120", "5.00GB"},
-                                       {"5497558138880", "5120.00GB"},
-                                       {"", ""},
-                                       {"N/A", "N/A"},
-                                       {"n/a", "n/a"},
-                                       {"lots", "0.00KB"},
-                                       {"nan", "0.00KB"}})
-        EXPECT_EQ(FormatSize(bytes), shown) << bytes;
-}
-
-TEST(ViewRules, PathsNameTheFileAndTheFolderAsTheTableShowsThem)
-{
-    for (const auto& [path, last, title] : {std::tuple{"/srv/in/Proofs/a.b.pdf", "a.b.pdf", "a.b"},
-                                            {"/srv/in/Proofs/", "Proofs", "Proofs"},
-                                            {"/srv/in/.profile", ".profile", ".profile"},
-                                            {"report", "report", "report"},
-                                            {"/", "", ""},
-                                            {"", "", ""}})
-        EXPECT_EQ(LastPathComponent(path) + "|" + FileTitle(path), wxString(last) + "|" + title) << path;
+    wxString shown;
+    for (const char* bytes : {"2048", "1048576", "1048577", "1073741825", "5497558138880", "", "N/A", "nan"})
+        shown << FormatSize(bytes) << ",";
+    EXPECT_EQ(shown, "2.00KB,1024.00KB,1.00MB,1.00GB,5120.00GB,,N/A,0.00KB,");
 }
 
 TEST(ViewRules, FiltersMatchIgnoringCaseAndTrailingSpaceAndMergeTellsCaseApart)
 {
     EXPECT_TRUE(SameFilterText("srv1", "SRV1 \t"));
-    EXPECT_FALSE(SameFilterText(" srv1", "srv1"));
-    EXPECT_FALSE(SameFilterText("srv1", "srv10"));
-    const wxString all = "All Servers      ";
-    // entries, names, entries after (comma-separated, "All Servers" first in each).
-    for (const auto& [entries, names, expected] :
-         {std::tuple{"ABC", "abc", ""}, // abc is not added (ABC is there), and ABC goes (it is not abc)
-          {"", "srv1,srv2 ", "srv1,srv2"},
-          {"srv2,gone,srv1", "srv1,srv2,new", "srv2,srv1,new"},
-          {"srv1 ", "srv1", "srv1 "},
-          {"srv1", "", ""}})
-    {
-        const auto list = [&](const char* text, bool withAll)
-        {
-            wxArrayString items = wxSplit(text, ',', '\0');
-            if (*text == '\0')
-                items.clear();
-            if (withAll)
-                items.Insert(all, 0);
-            return items;
-        };
-        EXPECT_EQ(MergeFilterEntries(list(entries, true), list(names, false), all), list(expected, true))
-            << entries;
-    }
+    EXPECT_FALSE(SameFilterText(" srv1", "srv1") || SameFilterText("srv1", "srv10"));
+    // The entries before, the names now, the entries after: "All" stays first, gone names go, new
+    // ones come last, trimmed; abc is not added (ABC is there), and ABC goes (it is not abc).
+    for (const auto& [entries, names, merged] :
+         {std::tuple{"All,srv2,gone,srv1 ", "srv1,srv2,new ", "All,srv2,srv1 ,new"},
+          {"All,ABC", "abc", "All"}})
+        EXPECT_EQ(wxJoin(MergeFilterEntries(wxSplit(entries, ','), wxSplit(names, ','), "All"), ','), merged);
 }
 
-TEST(ViewRules, FootersCountSelectAndSayWhenTheJournalCouldNotBeRead)
+TEST(ViewRules, FootersFollowTheTranslatedOrderAndSayWhenTheJournalCouldNotBeRead)
 {
-    EXPECT_EQ(CountFooter(3), "3 Items ");
-    EXPECT_EQ(SelectionFooter("[WYX3Value1] of [WYX3Value2] items selected.", 1, 12),
-              "1 of 12 items selected.");
     EXPECT_EQ(SelectionFooter("[WYX3Value2] Zeilen, [WYX3Value1] markiert", 1, 12), "12 Zeilen, 1 markiert");
-    EXPECT_EQ(SelectionFooter("[WYX3Value1]/[WYX3Value1]", 2, 5), "2/[WYX3Value1]");
-
     const JournalNoticeTexts texts{"busy since %s", "cannot be read", "back since %s"};
     const std::time_t at = wxDateTime(6, wxDateTime::Dec, 2026, 10, 42).GetTicks();
     using State = JournalWatch::State;
@@ -107,45 +65,31 @@ TEST(ViewRules, SortsTextIgnoringCaseNumbersAsUnsignedAndTiesKeepTheirOrder)
     // Unreadable counts as zero; a number beyond 64 bits still sorts above.
     EXPECT_EQ(SortOrder({"1383035055", "x", "99", "18446744073709551616999"}, SortKind::Number, true),
               (Order{3, 0, 2, 1}));
-
-    std::vector<JobRecord> records(4);
-    for (std::size_t i = 0; i < records.size(); ++i)
-        records[i].fill(wxString::Format("r%zu", i));
-    ApplyOrder(records, {2, 0, 3, 1});
-    EXPECT_EQ(records[0][7] + records[1][0] + records[2][3] + records[3][7], "r2r0r3r1");
 }
 
-TEST(ViewRules, EachColumnKeepsItsOwnAlternationAndOthersAreRefused)
+TEST(ViewRules, EachColumnKeepsItsOwnAlternationAndOthersAreRefusedAndWidthsNeverShrink)
 {
     ColumnSortState state(7, 1, false);
     // column clicked, accepted, then the sorted column and whether it descends.
     for (const auto& [column, accepted, sorted, descending] : {std::tuple{4, true, 4, true},
                                                                {2, true, 2, true},
                                                                {4, true, 4, false},
-                                                               {0, false, 4, false},
-                                                               {-1, false, 4, false},
                                                                {8, false, 4, false},
-                                                               {4, true, 4, true},
                                                                {1, true, 1, true}})
     {
         EXPECT_EQ(state.Click(column), accepted) << column;
-        EXPECT_EQ(state.Column(), sorted) << column;
-        EXPECT_EQ(state.Descending(), descending) << column;
+        EXPECT_EQ(state.Column() * 10 + state.Descending(), sorted * 10 + descending) << column;
     }
-}
-
-TEST(ViewRules, WidthsScaleWithTheFontButNeverNarrower)
-{
     EXPECT_EQ(ScaleColumnWidth(145, 6.5), 145);
     EXPECT_EQ(ScaleColumnWidth(145, 5.0), 145);
     EXPECT_EQ(ScaleColumnWidth(100, 8.125), 125);
 }
 
 // Status records as the model gives them: key, path, folder, server, size, format, time, status.
-JobRecord Job(const char* key, const char* file, const char* server, const char* size, const char* status)
+JobRecord Job(const char* key, const char* file, const char* server, const char* size)
 {
-    return {key,   wxString("/srv/in/Proofs/") + file, "/srv/in/Proofs", server, size, "PDF", "12/06/26",
-            status};
+    return {key,     wxString("/srv/in/Proofs/") + file, "/srv/in/Proofs", server, size, "PDF", "12/06/26",
+            "Queued"};
 }
 
 // One field of every shown row, joined.
@@ -164,29 +108,23 @@ wxString Shown(const StatusRows& rows, int field = 0)
 TEST(StatusTable, ShowsDisplayRowsInSortOrderForTheChosenServer)
 {
     auto read = std::make_shared<JobSnapshot>();
-    read->jobs = {Job("1", "b.pdf", "SRV1 ", "2048", "Saving..."), Job("2", "A.pdf", "srv2", "N/A", "Queued"),
-                  Job("3", "c.tiff", "srv1", "1048577", "Transferring to server")};
+    read->jobs = {Job("1", "b.pdf", "SRV1 ", "2048"), Job("2", "A.pdf", "srv2", "N/A"),
+                  Job("3", "c.tiff", "srv1", "1048577")};
     read->startTimes = {30, 10, 20};
     StatusTable table;
     table.Replace(read);
-    EXPECT_EQ(Shown(*table.Rows(false, wxString())), "1,2,3,") << "journal order until sorted";
-
     table.Sort(1, false);
     const auto rows = table.Rows(false, wxString());
     JobRecord first;
     rows->MakeRow(0, first);
     EXPECT_EQ(first, (JobRecord{"2", "A", "Proofs", "srv2", "N/A", "PDF", "12/06/26", "Queued"}));
-    EXPECT_EQ(Shown(*rows, 1), "A,b,c,");
-    EXPECT_EQ(Shown(*rows, 4), "N/A,2.00KB,1.00MB,");
+    EXPECT_EQ(Shown(*rows, 1) + Shown(*rows, 4), "A,b,c,N/A,2.00KB,1.00MB,");
 
     table.Sort(6, true); // Time: latest start first
     const auto srv1 = table.Rows(true, "srv1");
     EXPECT_EQ(Shown(*srv1), "1,3,");
     EXPECT_EQ(srv1->FindKey("3"), 1);
     EXPECT_EQ(srv1->FindKey("2"), -1) << "filtered out";
-
-    table.Sort(0, true); // not a sortable column: the order stays
-    EXPECT_EQ(table.SortedJob(0)[0], "1");
 
     table.Replace(std::make_shared<JobSnapshot>());
     EXPECT_EQ(table.Size(), 0u);
