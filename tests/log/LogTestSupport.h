@@ -27,18 +27,13 @@ public:
 };
 
 // 15 March 2021, 14:05:30 as an MS-DOS date-time.
-inline wxString SampleDosTime()
-{
-    const unsigned long date = ((2021 - 1980) << 9) | (3 << 5) | 15;
-    const unsigned long time = (14 << 11) | (5 << 5) | (30 / 2);
-    return wxString::Format("%lu", (date << 16) | time);
-}
+constexpr const char* kDosTime = "1383035055";
 
 // The fields of a log journal line, without its tag: what a producer passes to AddJob.
 inline wxString LogFields(const wxString& key, const wxString& status = "Transferred Successfully",
                           const wxString& hotFolder = "/srv/hotfolders/In")
 {
-    return key + "\t" + hotFolder + "\t" + hotFolder + "/" + key + ".pdf\tPRN-01\t" + SampleDosTime() + "\t" +
+    return key + "\t" + hotFolder + "\t" + hotFolder + "/" + key + ".pdf\tPRN-01\t" + kDosTime + "\t" +
            status + "\tdetail of " + key;
 }
 
