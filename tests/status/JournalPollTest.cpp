@@ -8,14 +8,21 @@
 
 #include <atomic>
 #include <functional>
+#include <memory>
 #include <set>
 #include <thread>
 
+#include <wx/filename.h>
+
 #include "../log/LogTestSupport.h"
 #include "StatusTestSupport.h"
+#include "data/DosTime.h"
 #include "data/JobLogManager.h"
 #include "data/JobStatusManager.h"
 #include "data/NamedMutex.h"
+#include "data/StatusLine.h"
+#include "pump/bus/CustomEvents.h"
+#include "pump/bus/EventBus.h"
 
 namespace
 {
@@ -75,29 +82,40 @@ protected:
     {
         for (const wxEventType type :
              {wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBLOG, wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS})
-            m_handler.Bind(wxEventTypeTag<wxCommandEvent>(type), [this](wxCommandEvent&) { ++m_updates; });
+            m_handler.Bind(wxEventTypeTag<wxCommandEvent>(type),
+                           [this](wxCommandEvent& event)
+                           {
+                               ++m_updates;
+                               m_lastId = event.GetId();
+                           });
         EventBus::Get().Subscribe(ChannelKey(1), &m_handler);
         EventBus::Get().Subscribe(ChannelKey(2), &m_handler);
     }
     ~JournalPoll() override { EventBus::Get().Unsubscribe(&m_handler); }
     wxString Journal() const { return GetDataDirectory() + Kind::kJournal + ".txt"; }
-    wxString LockPath() const { return m_root.Path() + "/dev/shm/" + Kind::kJournal + ".lock"; }
     // Writes one ADDED line for each key.
     void Write(std::initializer_list<wxString> keys)
     {
-        wxString text;
+        std::vector<wxString> lines;
         for (const wxString& key : keys)
-            text += Kind::Fields(key) + "\tADDED\r\n";
+            lines.push_back(Kind::Fields(key) + "\tADDED");
+        WriteLines(lines);
+    }
+    void WriteLines(const std::vector<wxString>& lines)
+    {
+        wxString text;
+        for (const wxString& line : lines)
+            text += line + "\r\n";
         wyxtest::SystemRoot::WriteFile(Journal(), text);
     }
-    std::vector<wxString> Keys(const Model& model) const
+    std::vector<wxString> Keys(const Model& model, std::size_t field = 0) const
     {
         std::uint64_t cursor = 0;
         std::vector<JobRecord> shown;
         Kind::Take(model, cursor, shown);
         std::vector<wxString> keys;
         for (const JobRecord& record : shown)
-            keys.push_back(record[0]);
+            keys.push_back(record[field]);
         return keys;
     }
     int Updates()
@@ -109,6 +127,7 @@ protected:
     Model m_model{Journal()};
     wxEvtHandler m_handler;
     int m_updates = 0;
+    int m_lastId = -1;
 };
 
 using ModelKinds = testing::Types<StatusModelKind, LogModelKind>;
@@ -190,7 +209,8 @@ TYPED_TEST(JournalPoll, APlantedLockPathIsNeverWaitedOnAndMakesTheJournalUnreada
         {"link", [](const char* path) { return ::symlink("/etc/passwd", path); }}};
     ::mkdir((this->m_root.Path() + "/dev").utf8_str(), 0755);
     ::mkdir((this->m_root.Path() + "/dev/shm").utf8_str(), 01777);
-    const std::string lock = this->LockPath().ToStdString();
+    const std::string lock =
+        (this->m_root.Path() + "/dev/shm/" + TypeParam::kJournal + ".lock").ToStdString();
     for (const auto& [name, plant] : plants)
     {
         SCOPED_TRACE(name);
@@ -216,7 +236,7 @@ TYPED_TEST(JournalPoll, APlantedLockPathIsNeverWaitedOnAndMakesTheJournalUnreada
 // Producer, poller and the GUI thread at once; run under ThreadSanitizer too.
 TYPED_TEST(JournalPoll, PollerProducerAndViewTogetherLoseAndRepeatNothing)
 {
-    constexpr int kJobs = 200;
+    constexpr int kJobs = 100;
     this->Write({});
     std::atomic<bool> producing{true};
     std::atomic<bool> polling{true};
@@ -251,12 +271,106 @@ TYPED_TEST(JournalPoll, PollerProducerAndViewTogetherLoseAndRepeatNothing)
     poller.join();
     TypeParam::Take(this->m_model, cursor, shown);
 
-    std::multiset<wxString> keys;
+    std::set<wxString> keys;
     for (const JobRecord& record : shown)
         keys.insert(record[0]);
     EXPECT_EQ(shown.size(), static_cast<std::size_t>(kJobs));
-    for (int i = 0; i < kJobs; ++i)
-        EXPECT_EQ(keys.count(wxString::Format("job-%d", i)), 1u) << i;
+    EXPECT_EQ(keys.size(), static_cast<std::size_t>(kJobs)) << "only the producer's keys, each once";
+}
+
+// The status model's own rules.
+using StatusModel = JournalPoll<StatusModelKind>;
+
+// Shown are whole lines of nine pieces (empty ones do not count) of live jobs, in journal order.
+TEST_F(StatusModel, KeepsJournalOrderShowsOnlyWholeLinesOfLiveJobsAndPublishesEachNewList)
+{
+    using statustest::StatusLine;
+    const wxString k7 =
+        "K7\t/hf/In\t/hf/In/report final.ps\tPRN-02\t1383035055\tTransferring to server\tN/A\t"
+        "PostScript\tadded";
+    WriteLines({StatusLine("3", "ADDED"), "", StatusLine("4", "COMMIT"), "ADDED", "\t\t\t",
+                "5\t/hf\t/hf/a.pdf\tPRN\t1383035055\tSaving...\t\tPDF\tADDED",
+                "6\t/hf\t/hf/a.pdf\tPRN\t1383035055\tSaving...\tPDF\tADDED", StatusLine("7", "extra\tADDED"),
+                StatusLine("8", "ADDED2"), StatusLine("1", "modified"), StatusLine("2", "MODIFIED"),
+                "\t\t" + StatusLine("9", "ADDED") + "\t", StatusLine(" ", "ADDED"), k7});
+    EXPECT_EQ(m_model.Refresh(), 1);
+    EXPECT_EQ(Keys(m_model), (std::vector<wxString>{"3", "1", "2", "9", " ", "K7"}));
+    JobRecord record;
+    EXPECT_FALSE(ParseStatusLine(StatusLine("1", "ADDED\r"), record)) << "a carriage return stays in the tag";
+    ASSERT_TRUE(ParseStatusLine(k7, record));
+    EXPECT_EQ(record, (JobRecord{"K7", "/hf/In/report final.ps", "/hf/In", "PRN-02", "N/A", "PostScript",
+                                 FormatDosTime("1383035055"), "Transferring to server"}));
+    EXPECT_FALSE(record[StatusField::TimeText].empty());
+
+    // A touched file is read again, even with nothing changed in it.
+    wxFileName file(Journal());
+    const wxDateTime later = file.GetModificationTime() + wxTimeSpan::Seconds(7);
+    ASSERT_TRUE(file.SetTimes(nullptr, &later, nullptr));
+    EXPECT_EQ(m_model.Refresh(), 1);
+    // Only committed jobs left: the list empties, published once.
+    WriteLines({StatusLine("1", "COMMIT"), StatusLine("2", "COMMIT")});
+    EXPECT_EQ(m_model.Refresh(), 1);
+    EXPECT_EQ(m_model.Refresh(), 0);
+    EXPECT_EQ(Updates(), 3);
+    EXPECT_EQ(m_lastId, 0);
+    EXPECT_TRUE(Keys(m_model).empty());
+}
+
+// Stopped, a free lock is still taken; the read stops at once and keeps what
+// it has, and the journal counts as not yet read.
+TEST_F(StatusModel, WhileStoppedAFreeLockIsTakenAndTheCutReadIsReadWholeLater)
+{
+    Write({"1"});
+    ASSERT_EQ(m_model.Refresh(), 1);
+    m_model.SetRunning(false);
+    WriteLines({statustest::StatusLine("1", "ADDED"), statustest::StatusLine("2", "ADDED", "Sent")});
+    EXPECT_EQ(m_model.Refresh(), 1);
+    EXPECT_TRUE(Keys(m_model).empty());
+    m_model.SetRunning(true);
+    EXPECT_EQ(m_model.Refresh(), 1);
+    EXPECT_EQ(Keys(m_model, StatusField::Status), (std::vector<wxString>{"Saving...", "Sent"}));
+    EXPECT_EQ(Updates(), 3);
+}
+
+TEST_F(StatusModel, AReadNoViewShowsAnyMoreIsFreedAtTheNextPollEvenWithoutAChange)
+{
+    Write({"1"});
+    ASSERT_EQ(m_model.Refresh(), 1);
+    std::weak_ptr<const JobSnapshot> first = m_model.GetSnapshot();
+    {
+        const std::shared_ptr<const JobSnapshot> shown = m_model.GetSnapshot(); // as a view holds it
+        Write({"2"});
+        ASSERT_EQ(m_model.Refresh(), 1);
+        EXPECT_EQ(m_model.Refresh(), 0);
+        EXPECT_FALSE(first.expired()) << "still shown";
+    }
+    EXPECT_EQ(m_model.Refresh(), 0);
+    EXPECT_TRUE(first.expired()) << "the journal did not change, and the old read went all the same";
+}
+
+// Each poll: r read, b busy or u unreadable, then what the watch says after it:
+// ! to tell the view, the state (R, B, U), since when, and + when recovered.
+TEST(JournalWatchRules, TellOfABusyJournalAfterAFewPollsAndOfAnUnreadableOneAtOnce)
+{
+    // A lock held at two polls is a producer at work: no news.
+    for (const char* sequence :
+         {"b-R0 b-R0 r-R0", "b-R0 b-R0 b!B1 b-B1 r!R5+ r-R5+", "u!U1 u-U1 b-U1 r!R4+", "b-R0 r-R0 b-R0 b-R0"})
+    {
+        JournalWatch watch;
+        std::time_t now = 0;
+        for (const wxString& poll : wxSplit(sequence, ' '))
+        {
+            SCOPED_TRACE(poll + wxString::Format(" at poll %d", static_cast<int>(++now)));
+            const bool told = poll[0] == 'r'   ? watch.NoteRead(now)
+                              : poll[0] == 'b' ? watch.NoteBusy(now)
+                                               : watch.NoteUnreadable(now);
+            const JournalWatch::Report report = watch.Get();
+            EXPECT_EQ(wxString(told ? "!" : "-") + "RBU"[static_cast<int>(report.state)] +
+                          wxString::Format("%d", static_cast<int>(report.since)) +
+                          (report.recovered ? "+" : ""),
+                      poll.Mid(1));
+        }
+    }
 }
 
 } // namespace
