@@ -1,6 +1,11 @@
 #pragma once
 
+#include <wx/app.h>
+#include <wx/event.h>
+
 #include "SystemRoot.h"
+#include "pump/bus/CustomEvents.h"
+#include "pump/bus/EventBus.h"
 
 namespace statustest
 {
