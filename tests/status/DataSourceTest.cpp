@@ -10,73 +10,47 @@
 namespace
 {
 
-// The entries joined by '|', to compare a whole list at once.
-wxString Joined(const wxArrayString& entries)
-{
-    return wxJoin(entries, '|', 0);
-}
-
-TEST(DataSourceFile, GivesTheEntriesOfEachSection)
-{
-    struct Case
-    {
-        const char* text;
-        const char* hotFolders;
-        const char* servers;
-    };
-    for (const Case& c : std::vector<Case>{
-             {"", "", ""},
-             {"/orphan\n[Servers]\nPRN-1\n", "", "PRN-1"},
-             {"[HotFolders]\n/srv/a\n/srv/b c\n[Servers]\nPRN-1\nPRN 2\n", "/srv/a|/srv/b c", "PRN-1|PRN 2"},
-             {"[hotfolders]\r\n  /srv/a  \r\n\r\n; /srv/commented\r\n# also\r\n[ SERVERS ]\r\nX\r\n",
-              "/srv/a", "X"},
-             {"[HotFolders]\n/srv/a\n[Other]\n/srv/ignored\n[HotFolders]\n/srv/b", "/srv/a|/srv/b", ""},
-             {"[Servers]\nSt\xC3\xBCttgart-01\n[HotFolders]\n/srv/\xE6\x97\xA5\n", "/srv/\xE6\x97\xA5",
-              "St\xC3\xBCttgart-01"},
-             {"[Servers\nA\n", "", ""}})
-    {
-        wxArrayString hotFolders(1, "stale");
-        wxArrayString servers;
-        WyxDataSource::ParseConfiguration(wxString::FromUTF8(c.text), hotFolders, servers);
-        EXPECT_EQ(Joined(hotFolders), wxString::FromUTF8(c.hotFolders)) << c.text;
-        EXPECT_EQ(Joined(servers), wxString::FromUTF8(c.servers)) << c.text;
-    }
-}
-
-// The instance reads the file below WYX_SYSTEM_ROOT at every call.
-TEST(DataSourceInstance, ReadsTheFileAnewAtEachCallLineByLineAndWaitsOnNoFifo)
+// The instance reads the file below WYX_SYSTEM_ROOT at every call; each file
+// text (raw bytes: a stray one costs only its own line) gives the hot folders
+// and the servers, each list joined by '|'.
+TEST(DataSource, ReadsEachSectionOfTheFileAnewAtEachCallLineByLineAndWaitsOnNoFifo)
 {
     wyxtest::SystemRoot root;
     const wxString ini = GetDataDirectory() + "HotFolders.ini";
-    WyxDataSource& source = WyxDataSource::GetInstance();
-    const auto list = [&source](bool servers)
+    const auto lists = [] // what the data source gives, "stale" entries left in the arrays would show
     {
-        wxArrayString entries(1, "stale");
-        const long count = servers ? source.GetServersList(entries) : source.GetHotFoldersList(entries);
-        EXPECT_EQ(count, static_cast<long>(entries.size()));
-        return Joined(entries);
+        wxArrayString hotFolders(1, "stale");
+        wxArrayString servers(1, "stale");
+        const long folderCount = WyxDataSource::GetInstance().GetHotFoldersList(hotFolders);
+        const long serverCount = WyxDataSource::GetInstance().GetServersList(servers);
+        EXPECT_EQ(folderCount + serverCount, static_cast<long>(hotFolders.size() + servers.size()));
+        return wxJoin(hotFolders, '|', 0) + " " + wxJoin(servers, '|', 0);
     };
-    const auto configure = [&ini](const char* text) // raw bytes: a stray one stays as it is
+    EXPECT_EQ(lists(), " ") << "no file";
+    for (const auto& [text, expected] : std::vector<std::pair<const char*, const char*>>{
+             {"", " "},
+             {"/orphan\n[Servers]\nPRN-1\n", " PRN-1"},
+             {"[HotFolders]\n/srv/a\n/srv/b c\n[Servers]\nPRN-1\nPRN 2\n", "/srv/a|/srv/b c PRN-1|PRN 2"},
+             {"[hotfolders]\r\n  /srv/a  \r\n\r\n; /srv/commented\r\n# also\r\n[ SERVERS ]\r\nX\r\n",
+              "/srv/a X"},
+             {"[HotFolders]\n/srv/a\n[Other]\n/srv/ignored\n[HotFolders]\n/srv/b", "/srv/a|/srv/b "},
+             {"[Servers]\nSt\xC3\xBCttgart-01\n[HotFolders]\n/srv/\xE6\x97\xA5\n",
+              "/srv/\xE6\x97\xA5 St\xC3\xBCttgart-01"},
+             {"[HotFolders]\n/srv/Z\xC3\xBCrich\n/srv/M\xFCnchen\n[Servers]\nPRN-1\n",
+              "/srv/Z\xC3\xBCrich|/srv/M\xC3\xBCnchen PRN-1"},
+             {"[Servers\nA\n", " "}})
     {
         wxFFile file(ini, "wb");
-        ASSERT_TRUE(file.Write(text, std::strlen(text)));
-    };
-    EXPECT_EQ(list(true) + list(false), "");
-    configure("[HotFolders]\n/srv/a\n[Servers]\nPRN-1\n");
-    EXPECT_EQ(list(true), "PRN-1");
-    configure("[HotFolders]\n/srv/a\n/srv/b\n[Servers]\nPRN-2\n");
-    EXPECT_EQ(list(false), "/srv/a|/srv/b");
-    EXPECT_EQ(list(true), "PRN-2");
-    // A stray byte costs only its own line.
-    configure("[HotFolders]\n/srv/Z\xC3\xBCrich\n/srv/M\xFCnchen\n[Servers]\nPRN-1\n");
-    EXPECT_EQ(list(false), wxString::FromUTF8("/srv/Z\xC3\xBCrich|/srv/M\xC3\xBCnchen"));
-    EXPECT_EQ(list(true), "PRN-1");
+        ASSERT_EQ(file.Write(text, std::strlen(text)), std::strlen(text));
+        file.Close();
+        EXPECT_EQ(lists(), wxString::FromUTF8(expected)) << text;
+    }
     wxRemoveFile(ini);
     ASSERT_EQ(::mkfifo(ini.utf8_str(), 0666), 0);
-    EXPECT_EQ(list(true), "");
+    EXPECT_EQ(lists(), " ");
 }
 
-TEST(DataSourceInstance, RecordsEachIconChangeInMemoryAndInTheLogEvenWithoutADataFolder)
+TEST(DataSource, RecordsEachIconChangeInMemoryAndInTheLogEvenWithoutADataFolder)
 {
     wyxtest::SystemRoot root;
     WyxDataSource& source = WyxDataSource::GetInstance();

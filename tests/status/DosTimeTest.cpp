@@ -47,35 +47,28 @@ wyxos::LocaleTimeInfo PatternInfo(const char* date, const char* time)
     return info;
 }
 
+// Kind (D or T), the hour, the pattern and after '=' what it gives at 15 March
+// 2021, hh:05:30. Runs longer than a field's longest form give nothing; quotes
+// are copied and the letters inside still count.
 TEST(PatternWalk, ProducesTheDocumentedItems)
 {
-    struct Walk
+    for (const wxString& walk : wxSplit(
+             wxString::FromUTF8("D14dd/MM/yy=15/03/21|D14M/d/yy=3/15/21|D14d.M.yyyy=15.3.2021|"
+                                "D14y yy yyy yyyy yyyyy=1 21  2021 |D14d 'de' MMMM=15 '15e' March|"
+                                "D14MMM MMMM MMMMM ddd dddd ddddd=Mar March  Mon Monday |"
+                                "D14yyyy\xE5\xB9\xB4MM\xE6\x9C\x88=2021\xE5\xB9\xB4"
+                                "03\xE6\x9C\x88|D14=|"
+                                "T14HH:mm:ss h:mm:ss tt=14:05:30 2:05:30 PM|T00h:mm tt hh t=12:05 AM 12 A|"
+                                "T12h:mm t=12:05 P|T09H:m:s HH HHH hhh mmm sss ttt 'h'=9:5:30 09      '9'|"
+                                "T21hh=09|T23H.mm=23.05"),
+             '|'))
     {
-        bool date;
-        const char* pattern;
-        unsigned hour;
-        const char* expected;
-    };
-    // Runs longer than a field's longest form give nothing; quotes are copied
-    // and the letters inside still count.
-    for (const Walk& walk :
-         {Walk{true, "dd/MM/yy", 14, "15/03/21"}, Walk{true, "M/d/yy", 14, "3/15/21"},
-          Walk{true, "d.M.yyyy", 14, "15.3.2021"}, Walk{true, "y yy yyy yyyy yyyyy", 14, "1 21  2021 "},
-          Walk{true, "MMM MMMM MMMMM ddd dddd ddddd", 14, "Mar March  Mon Monday "},
-          Walk{true, "d 'de' MMMM", 14, "15 '15e' March"},
-          Walk{true, "yyyy\xE5\xB9\xB4MM\xE6\x9C\x88", 14,
-               "2021\xE5\xB9\xB4"
-               "03\xE6\x9C\x88"},
-          Walk{true, "", 14, ""}, Walk{false, "HH:mm:ss h:mm:ss tt", 14, "14:05:30 2:05:30 PM"},
-          Walk{false, "h:mm tt hh t", 0, "12:05 AM 12 A"}, Walk{false, "h:mm t", 12, "12:05 P"},
-          Walk{false, "H:m:s HH HHH hhh mmm sss ttt 'h'", 9, "9:5:30 09      '9'"},
-          Walk{false, "hh", 21, "09"}, Walk{false, "H.mm", 23, "23.05"}})
-    {
-        const wxString pattern = wxString::FromUTF8(walk.pattern);
-        EXPECT_EQ(walk.date ? WalkDatePattern(pattern, Moment(walk.hour), kEnglish)
-                            : WalkTimePattern(pattern, Moment(walk.hour), kEnglish),
-                  wxString::FromUTF8(walk.expected))
-            << walk.pattern << " at hour " << walk.hour;
+        const CalendarFields moment = Moment(std::stoul(walk.Mid(1, 2).ToStdString()));
+        const wxString pattern = walk.Mid(3).BeforeFirst('=');
+        EXPECT_EQ(walk[0] == 'D' ? WalkDatePattern(pattern, moment, kEnglish)
+                                 : WalkTimePattern(pattern, moment, kEnglish),
+                  walk.AfterFirst('='))
+            << walk;
     }
     // Names that could not be fetched produce nothing.
     const wyxos::LocaleNames none;
@@ -121,43 +114,32 @@ TEST(FormatDosTime, SplitsTheValueIntoLocalDateAndTimeOfRealMomentsOnlyFallingBa
               FormatLocaleDate(moment) + ", " + FormatLocaleTime(moment));
 }
 
+// Kind (D or T), the C library's format, and after '=' our pattern, or nothing
+// when it cannot be read: a literal letter the walker would take for a field,
+// neighbouring fields that would merge into one run, no equivalent, a field of
+// the other kind.
 TEST(StrftimeConversion, GivesTheWindowsLettersOrRefuses)
 {
-    constexpr auto D = wyxos::PatternKind::Date;
-    constexpr auto T = wyxos::PatternKind::Time;
-    struct Case
+    for (const wxString& c :
+         wxSplit("D%e.%m.%Y=d.MM.yyyy|D%-d.%-m.%Y=d.M.yyyy|D%a %d %b %Y=ddd dd MMM yyyy|"
+                 "D%A, %B %d=dddd, MMMM dd|D%D %F=MM/dd/yy yyyy-MM-dd|T%R %k %l %p=HH:mm H h tt|"
+                 "T%H%%%M=HH%mm|D%Y-%m-%d KW=yyyy-MM-dd KW|T%M%S=mmss|T%r=tt hh:mm|T%Hh%M=|D%Y y=|"
+                 "D%d%e=|T%H%k=|D%Ey=|D%j=|D%x=|D%H:%M=|T%d %H=|T%P=|D%-y=|T%H%=",
+                 '|'))
     {
-        const char* format;
-        wyxos::PatternKind kind;
-        const char* expected; // nullptr: cannot be read
-    };
-    for (const Case& c :
-         {Case{"%e.%m.%Y", D, "d.MM.yyyy"}, Case{"%-d.%-m.%Y", D, "d.M.yyyy"},
-          Case{"%a %d %b %Y", D, "ddd dd MMM yyyy"}, Case{"%A, %B %d", D, "dddd, MMMM dd"},
-          Case{"%D", D, "MM/dd/yy"}, Case{"%F", D, "yyyy-MM-dd"}, Case{"%R", T, "HH:mm"},
-          Case{"%k:%M", T, "H:mm"}, Case{"%l:%M %p", T, "h:mm tt"}, Case{"%H%%%M", T, "HH%mm"},
-          Case{"%Y-%m-%d KW", D, "yyyy-MM-dd KW"}, Case{"%M%S", T, "mmss"},
-          // A literal letter the walker would read as a field, or neighbouring
-          // conversions that would merge into one longer run.
-          Case{"%Hh%M", T, nullptr}, Case{"%Y y", D, nullptr}, Case{"%d%e", D, nullptr},
-          Case{"%H%k", T, nullptr},
-          // No equivalent, or a field of the other kind.
-          Case{"%Ey", D, nullptr}, Case{"%j", D, nullptr}, Case{"%x", D, nullptr}, Case{"%H:%M", D, nullptr},
-          Case{"%d %H", T, nullptr}, Case{"%P", T, nullptr}, Case{"%-y", D, nullptr},
-          Case{"%H%", T, nullptr}})
-    {
+        const wxString expected = c.AfterFirst('=');
         wxString pattern = "untouched";
-        EXPECT_EQ(wyxos::ConvertStrftimePattern(wxString::FromUTF8(c.format), c.kind, "%I:%M:%S %p", pattern),
-                  c.expected != nullptr)
-            << c.format;
-        EXPECT_EQ(pattern, wxString::FromUTF8(c.expected ? c.expected : "untouched")) << c.format;
+        EXPECT_EQ(wyxos::ConvertStrftimePattern(
+                      c.Mid(1).BeforeFirst('='),
+                      c[0] == 'D' ? wyxos::PatternKind::Date : wyxos::PatternKind::Time, "%p %I:%M", pattern),
+                  !expected.empty())
+            << c;
+        EXPECT_EQ(pattern, expected.empty() ? "untouched" : expected) << c;
     }
     // The am/pm composite needs the locale's format, and one naming itself is not expanded for ever.
     wxString pattern;
-    EXPECT_FALSE(wyxos::ConvertStrftimePattern("%r", T, "", pattern));
-    EXPECT_TRUE(wyxos::ConvertStrftimePattern("%r", T, "%p %I:%M", pattern));
-    EXPECT_EQ(pattern, "tt hh:mm");
-    EXPECT_FALSE(wyxos::ConvertStrftimePattern("%r", T, "%r", pattern));
+    EXPECT_FALSE(wyxos::ConvertStrftimePattern("%r", wyxos::PatternKind::Time, "", pattern));
+    EXPECT_FALSE(wyxos::ConvertStrftimePattern("%r", wyxos::PatternKind::Time, "%r", pattern));
 }
 
 // strftime's %x or %X in a locale: the reference our walker must meet.

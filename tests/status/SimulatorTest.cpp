@@ -1,7 +1,6 @@
 #include <gtest/gtest.h>
 
 #include <set>
-#include <string>
 
 #include <wx/filename.h>
 #include <wx/tokenzr.h>
@@ -11,7 +10,6 @@
 #include "data/JobStatusManager.h"
 #include "platform/datasource/WyxDataSource.h"
 #include "tools/simulator/HotFolderSimulator.h"
-#include "tools/simulator/SimulatorOptions.h"
 
 namespace
 {
@@ -29,35 +27,6 @@ std::vector<wxArrayString> ReadJournal(const wxString& path)
     for (const wxString& line : lines)
         pieces.push_back(wxStringTokenize(line, "\t", wxTOKEN_STRTOK));
     return pieces;
-}
-
-// Runs the option parser over a command line given as one text.
-bool Parse(const char* line, SimulatorOptions& options)
-{
-    const wxArrayString words = wxSplit(line, ' ');
-    std::vector<std::string> texts(words.begin(), words.end());
-    std::vector<const char*> argv;
-    for (const std::string& text : texts)
-        argv.push_back(text.c_str());
-    wxString problem;
-    const bool parsed = ParseSimulatorOptions(static_cast<int>(argv.size()), argv.data(), options, problem);
-    EXPECT_EQ(parsed, problem.empty()) << line << ": " << problem;
-    return parsed;
-}
-
-TEST(SimulatorOptions, ReadsEveryOptionAndRefusesWhatItCannotRead)
-{
-    SimulatorOptions options;
-    ASSERT_TRUE(Parse("x --rate 30/min --duration 3600 --failure-share 0.5 --seed 42 --data-dir /tmp/d "
-                      "--step-seconds 0.1",
-                      options));
-    EXPECT_DOUBLE_EQ(options.jobsPerSecond, 0.5);
-    EXPECT_DOUBLE_EQ(options.durationSeconds + options.failureShare + options.stepSeconds, 3600.6);
-    EXPECT_TRUE(options.seedGiven && options.seed == 42u && options.dataDirectory == "/tmp/d");
-    for (const char* bad :
-         {"x --rate fast", "x --rate -3", "x --rate 3/h", "x --failure-share 2", "x --duration -1",
-          "x --seed 99999999999", "x --bogus 1", "x --rate", "x stray", "x --data-dir "})
-        EXPECT_FALSE(Parse(bad, options)) << bad;
 }
 
 // Half the jobs fail: each failed one marks its hot folder, and every job
@@ -78,10 +47,8 @@ TEST(Simulator, WritesWellFormedTrafficThatTheModelsRead)
     JobStatusManager status(simulator.DataDirectory() + "TiveraJobsStatusFile.txt");
     ASSERT_EQ(status.Parse(), 1);
     const HotFolderSimulator::Totals totals = simulator.Run();
-    EXPECT_GT(totals.failed, 0u);
-    EXPECT_GT(totals.succeeded, 0u);
+    EXPECT_TRUE(totals.failed > 0 && totals.succeeded > 0 && totals.journalErrors == 0);
     EXPECT_EQ(totals.started, totals.succeeded + totals.failed);
-    EXPECT_EQ(totals.journalErrors, 0u);
 
     wxArrayString hotFolders;
     WyxDataSource::GetInstance().GetHotFoldersList(hotFolders);
@@ -104,25 +71,6 @@ TEST(Simulator, WritesWellFormedTrafficThatTheModelsRead)
                   failedFolders.count(folder) == 1)
             << folder;
     EXPECT_TRUE(ReadJournal(simulator.DataDirectory() + "TiveraJobsStatusFile.txt").empty());
-}
-
-TEST(Simulator, AStopRequestEndsTheRunBetweenTwoWholeOperations)
-{
-    statustest::SystemRoot root;
-    SimulatorOptions options;
-    options.jobsPerSecond = 200;
-    options.stepSeconds = 0.005;
-    options.hotFolderRoot = root.Path() + "/srv/hotfolders";
-    int checks = 0;
-    HotFolderSimulator simulator(options, [&checks] { return ++checks > 40; });
-    wxString problem;
-    ASSERT_TRUE(simulator.Prepare(problem)) << problem;
-    EXPECT_GT(simulator.Run().started, 0u);
-    const std::vector<wxArrayString> left =
-        ReadJournal(simulator.DataDirectory() + "TiveraJobsStatusFile.txt");
-    EXPECT_FALSE(left.empty());
-    for (const wxArrayString& pieces : left)
-        EXPECT_EQ(pieces.size(), 9u);
 }
 
 } // namespace
