@@ -7,14 +7,11 @@
 #include <wx/init.h>
 #include <wx/log.h>
 
-namespace
+// Takes no command line of its own: GoogleTest's options are not the toolkit's.
+struct GuiTestApp : wxApp
 {
-class GuiTestApp : public wxApp
-{
-public:
     bool OnInit() override { return true; }
 };
-} // namespace
 
 int main(int argc, char** argv)
 {

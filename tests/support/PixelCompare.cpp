@@ -3,8 +3,6 @@
 #include <wx/bitmap.h>
 #include <wx/dcmemory.h>
 
-#include <sstream>
-
 namespace pixels
 {
 
@@ -30,33 +28,21 @@ std::string FirstDifference(const wxImage& actual, const wxImage& expected)
     if (actual.GetSize() != expected.GetSize())
         return "the sizes differ";
     for (int y = 0; y < actual.GetHeight(); ++y)
-    {
         for (int x = 0; x < actual.GetWidth(); ++x)
-        {
-            const wxColour a = At(actual, x, y);
-            const wxColour e = At(expected, x, y);
-            if (a != e)
-            {
-                std::ostringstream out;
-                out << "pixel (" << x << ", " << y << ") is " << a.GetAsString(wxC2S_HTML_SYNTAX)
-                    << ", expected " << e.GetAsString(wxC2S_HTML_SYNTAX);
-                return out.str();
-            }
-        }
-    }
+            if (At(actual, x, y) != At(expected, x, y))
+                return wxString::Format("pixel (%d, %d) is %s, expected %s", x, y,
+                                        At(actual, x, y).GetAsString(wxC2S_HTML_SYNTAX),
+                                        At(expected, x, y).GetAsString(wxC2S_HTML_SYNTAX))
+                    .ToStdString();
     return std::string();
 }
 
 bool AnyPixelDiffersIn(const wxImage& image, int x0, int x1, const wxColour& colour)
 {
     for (int x = x0; x < x1; ++x)
-    {
         for (int y = 0; y < image.GetHeight(); ++y)
-        {
             if (At(image, x, y) != colour)
                 return true;
-        }
-    }
     return false;
 }
 

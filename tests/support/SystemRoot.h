@@ -6,10 +6,8 @@
 
 #include <wx/arrstr.h>
 #include <wx/ffile.h>
-#include <wx/filefn.h>
 #include <wx/filename.h>
 #include <wx/init.h>
-#include <wx/string.h>
 #include <wx/utils.h>
 
 #include "TempFolder.h"
@@ -21,12 +19,9 @@ namespace wyxtest
 // Event queues need an application object; the unit tests have no window.
 class WxEnvironment : public ::testing::Environment
 {
-public:
+    std::unique_ptr<wxInitializer> m_init;
     void SetUp() override { m_init = std::make_unique<wxInitializer>(); }
     void TearDown() override { m_init.reset(); }
-
-private:
-    std::unique_ptr<wxInitializer> m_init;
 };
 
 // A fresh system root per test, with its data directory: journals, hot folders
@@ -41,8 +36,6 @@ public:
         wxFileName::Mkdir(GetDataDirectory(), wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
     }
     ~SystemRoot() { wxUnsetEnv("WYX_SYSTEM_ROOT"); }
-    SystemRoot(const SystemRoot&) = delete;
-    SystemRoot& operator=(const SystemRoot&) = delete;
 
     const wxString& Path() const { return m_root; }
 
@@ -53,10 +46,9 @@ public:
         wxString ini = "[HotFolders]\n";
         for (const wxString& name : names)
         {
-            const wxString path = m_root + "/srv/hotfolders/" + name;
-            wxFileName::Mkdir(path + "/[_KELVO_HotFolder_]", wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
-            paths.Add(path);
-            ini += path + "\n";
+            paths.Add(m_root + "/srv/hotfolders/" + name);
+            wxFileName::Mkdir(paths.Last() + "/[_KELVO_HotFolder_]", wxS_DIR_DEFAULT, wxPATH_MKDIR_FULL);
+            ini += paths.Last() + "\n";
         }
         WriteFile(GetDataDirectory() + "HotFolders.ini", ini);
         return paths;
@@ -69,8 +61,7 @@ private:
     static void Put(const wxString& path, const wxString& text, const char* mode)
     {
         wxFFile file(path, mode);
-        ASSERT_TRUE(file.IsOpened()) << path;
-        ASSERT_TRUE(file.Write(text, wxConvUTF8)) << path;
+        ASSERT_TRUE(file.IsOpened() && file.Write(text, wxConvUTF8)) << path;
     }
 
     TempFolder m_folder; // removed after the variable is unset
