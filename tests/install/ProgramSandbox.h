@@ -23,14 +23,14 @@ public:
     // accessibility: the bridge left on and the session bus passed, as a desktop session starts programs.
     explicit Sandbox(bool accessibility = false)
     {
-        const std::filesystem::path home = folder.Path() / "home";
-        std::filesystem::create_directories(home / "run");
-        ::chmod((home / "run").c_str(), 0700);
-        environment = {"HOME=" + home.string(),
+        const std::string home = (folder.Path() / "home").string();
+        std::filesystem::create_directories(home + "/run");
+        ::chmod((home + "/run").c_str(), 0700);
+        environment = {"HOME=" + home,
                        "WYX_SYSTEM_ROOT=" + (folder.Path() / "root").string(),
-                       "XDG_CONFIG_HOME=" + (home / ".config").string(),
-                       "XDG_STATE_HOME=" + (home / ".local/state").string(),
-                       "XDG_RUNTIME_DIR=" + (home / "run").string(),
+                       "XDG_CONFIG_HOME=" + home + "/.config",
+                       "XDG_STATE_HOME=" + home + "/.local/state",
+                       "XDG_RUNTIME_DIR=" + home + "/run",
                        "GDK_BACKEND=x11",
                        "LANG=C.UTF-8"};
         if (!accessibility)
@@ -44,18 +44,16 @@ public:
     // Whether the folder and the display are there; a failure says what is missing.
     ::testing::AssertionResult Ready() const
     {
-        if (folder.Path().empty())
-            return ::testing::AssertionFailure() << "no temporary folder";
-        if (!x.IsOpen())
-            return ::testing::AssertionFailure() << "no X display: run the tests under xvfb-run -a";
-        return ::testing::AssertionSuccess();
+        return folder.Path().empty() ? ::testing::AssertionFailure() << "no temporary folder"
+               : x.IsOpen()
+                   ? ::testing::AssertionSuccess()
+                   : ::testing::AssertionFailure() << "no X display: run the tests under xvfb-run -a";
     }
 
     // Runs a program to its end; its exit code, or -1 when it did not exit.
     int Run(const std::string& program, const std::vector<std::string>& arguments) const
     {
-        Program process(program, environment, std::nullopt, arguments);
-        const int status = process.Wait();
+        const int status = Program(program, environment, std::nullopt, arguments).Wait();
         return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
     }
 
