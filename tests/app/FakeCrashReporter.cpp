@@ -1,23 +1,15 @@
 // A stand-in crash reporter library. Each call of an entry appends its name to
 // the file that WYX_TEST_CRASH_LOG names. Built twice: with both entries, and
 // with WYX_INSTALL_ONLY, without "UninstallCrashReporter".
-#include <cstdio>
 #include <cstdlib>
+#include <fstream>
 
-namespace
-{
-
-void Record(const char* entry)
+static void Record(const char* entry)
 {
     const char* path = std::getenv("WYX_TEST_CRASH_LOG");
-    if (FILE* log = path ? std::fopen(path, "a") : nullptr)
-    {
-        std::fprintf(log, "%s\n", entry);
-        std::fclose(log);
-    }
+    if (path != nullptr)
+        std::ofstream(path, std::ios::app) << entry << "\n";
 }
-
-} // namespace
 
 extern "C" __attribute__((visibility("default"))) void InstallCrashReporter()
 {
