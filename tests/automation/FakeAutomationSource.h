@@ -3,6 +3,7 @@
 #include "platform/automation/AutomationSource.h"
 #include "platform/automation/MemoryRegions.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -34,9 +35,9 @@ struct FakeSource : automation::AutomationSource
     long ItemCount() const override { return static_cast<long>(rows.size()); }
     std::u16string ItemText(long item, int column) const override
     {
-        if (item < 0 || item >= ItemCount() || column < 0 || size_t(column) >= rows[size_t(item)].size())
-            return std::u16string();
-        return rows[size_t(item)][size_t(column)];
+        const bool in =
+            item >= 0 && item < ItemCount() && column >= 0 && size_t(column) < rows[size_t(item)].size();
+        return in ? rows[size_t(item)][size_t(column)] : u"";
     }
     long Current() const override { return current; }
     long TopIndex() const override { return top; }
@@ -50,10 +51,8 @@ struct FakeSource : automation::AutomationSource
     bool IsSingleSelection() const override { return singleSelection; }
     long SelectedCount() const override
     {
-        long count = 0;
-        for (unsigned state : states)
-            count += (state & automation::itemstate::kSelected) ? 1 : 0;
-        return count;
+        return std::count_if(states.begin(), states.end(),
+                             [](unsigned state) { return state & automation::itemstate::kSelected; });
     }
     bool ItemRect(long item, automation::Rect& rect) const override
     {
@@ -67,11 +66,10 @@ struct FakeSource : automation::AutomationSource
     {
         if (!ItemRect(item, rect) || column < 0 || size_t(column) >= columns.size())
             return false;
-        int left = 0;
+        rect.left = 0;
         for (int i = 0; i < column; ++i)
-            left += columns[size_t(i)].width;
-        rect.left = left;
-        rect.right = left + columns[size_t(column)].width;
+            rect.left += columns[size_t(i)].width;
+        rect.right = rect.left + columns[size_t(column)].width;
         return true;
     }
     const automation::AutomationSource* Header() const override { return header; }
@@ -79,10 +77,9 @@ struct FakeSource : automation::AutomationSource
     int ColumnCount() const override { return static_cast<int>(columns.size()); }
     bool Column(int column, automation::ColumnInfo& info) const override
     {
-        if (column < 0 || size_t(column) >= columns.size())
-            return false;
-        info = columns[size_t(column)];
-        return true;
+        const bool in = column >= 0 && size_t(column) < columns.size();
+        info = in ? columns[size_t(column)] : info;
+        return in;
     }
     int ScrolledLeft() const override { return scrolledLeft; }
     int ItemHeight(long) const override { return 18; }
@@ -94,12 +91,8 @@ struct FakeSource : automation::AutomationSource
 // Memory that holds only what a test says it holds.
 inline automation::MemoryRegion Region(const void* begin, size_t size, bool writable = true)
 {
-    automation::MemoryRegion region;
-    region.begin = reinterpret_cast<std::uintptr_t>(begin);
-    region.end = region.begin + size;
-    region.readable = true;
-    region.writable = writable;
-    return region;
+    const auto at = reinterpret_cast<std::uintptr_t>(begin);
+    return automation::MemoryRegion{at, at + size, true, writable, false, false};
 }
 
 } // namespace automationtest
