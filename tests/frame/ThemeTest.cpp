@@ -1,13 +1,11 @@
 // The theme records: every text the program draws on a themed background is
-// legible (WCAG 2 contrast ratio, at least 4.5:1), and the look-up rules.
+// legible (WCAG 2 contrast ratio, at least 4.5:1), and a selected row stands out.
 #include "platform/themer/Themer.h"
 
 #include <gtest/gtest.h>
-#include <wx/settings.h>
 
 #include <algorithm>
 #include <cmath>
-#include <string>
 
 namespace
 {
@@ -32,8 +30,6 @@ const Theme& Get(const char* name)
     return Themer::GetThemeService()->GetTheme(name);
 }
 
-const char* const kNames[6] = {"Default", "ListControl", "HeaderView", "Notebook", "FooterView", "Error"};
-
 TEST(Theme, EveryDrawnTextHasAContrastOfAtLeastFourAndAHalfToOne)
 {
     const Theme& list = Get("ListControl");
@@ -51,10 +47,9 @@ TEST(Theme, EveryDrawnTextHasAContrastOfAtLeastFourAndAHalfToOne)
                  {"selected tab", book.textColour, book.backgroundColour},
                  {"error detail", *wxBLACK, Get("Error").backgroundColour}};
     for (const auto& pair : pairs)
-    {
-        ASSERT_TRUE(pair.text.IsOk() && pair.background.IsOk()) << pair.what;
-        EXPECT_GE(ContrastRatio(pair.text, pair.background), 4.5) << pair.what;
-    }
+        EXPECT_GE(pair.text.IsOk() && pair.background.IsOk() ? ContrastRatio(pair.text, pair.background) : 0,
+                  4.5)
+            << pair.what;
     // The selection still stands out from both row backgrounds, with and without focus.
     for (const wxColour& row : {*wxWHITE, list.alternateRowColour})
     {
@@ -64,29 +59,4 @@ TEST(Theme, EveryDrawnTextHasAContrastOfAtLeastFourAndAHalfToOne)
     EXPECT_NE(list.selectionColour, list.inactiveSelectionColour);
 }
 
-TEST(Theme, UnknownNamesGiveDefaultAndKnownOnesTheirOwnRecord)
-{
-    const Theme* defaults = &Get("Default");
-    for (const char* name : {"", "default", "Notebook ", "Unknown", "ListControlX"})
-        EXPECT_EQ(&Get(name), defaults) << '"' << name << '"';
-    EXPECT_EQ(&Get(nullptr), defaults);
-    for (const char* name : kNames)
-    {
-        const Theme& t = Get(name);
-        EXPECT_EQ(&t == defaults, std::string(name) == "Default") << name;
-        // The fields the contrast check does not reach.
-        EXPECT_TRUE(t.backgroundColour.IsOk() && t.panelColour.IsOk() && t.lineColour.IsOk()) << name;
-    }
-    EXPECT_NE(Get("Error").backgroundColour, Get("Default").backgroundColour);
-}
-
-TEST(Theme, FontsAreTheSystemGuiFontAndItsBoldForTitles)
-{
-    const wxFont system = wxSystemSettings::GetFont(wxSYS_DEFAULT_GUI_FONT);
-    for (const wxFont& font : {Get("Error").textFont, Get("Error").titleFont})
-        EXPECT_TRUE(font.GetFaceName() == system.GetFaceName() &&
-                    font.GetFractionalPointSize() == system.GetFractionalPointSize());
-    EXPECT_EQ(Get("Error").titleFont.GetWeight(), wxFONTWEIGHT_BOLD);
-    EXPECT_NE(Get("Error").textFont.GetWeight(), wxFONTWEIGHT_BOLD);
-}
 } // namespace
