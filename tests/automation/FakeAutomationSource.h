@@ -19,16 +19,12 @@ struct FakeSource : automation::AutomationSource
     std::vector<std::vector<std::u16string>> rows; // a box's entries are rows of one cell
     std::vector<unsigned> states;
     std::vector<automation::ColumnInfo> columns;
-    long current = -1;
-    long top = 0;
-    long lastVisible = -1;
-    bool singleSelection = true;
+    long current = -1, top = 0, lastVisible = -1;
+    bool singleSelection = true, dropped = false;
     std::optional<int> headerHeight;
     int scrolledLeft = 0;
-    bool dropped = false;
     automation::Rect client{0, 0, 300, 200};
-    const FakeSource* header = nullptr;
-    const FakeSource* popup = nullptr;
+    const FakeSource *header = nullptr, *popup = nullptr;
 
     automation::ControlKind Kind() const override { return kind; }
     std::uintptr_t Handle() const override { return handle; }
@@ -56,11 +52,9 @@ struct FakeSource : automation::AutomationSource
     }
     bool ItemRect(long item, automation::Rect& rect) const override
     {
-        if (item < 0 || item >= ItemCount())
-            return false;
         const int y = int(item - top) * 20; // rows 20 pixels high
         rect = automation::Rect{0, y, client.right, y + 20};
-        return true;
+        return item >= 0 && item < ItemCount();
     }
     bool CellRect(long item, int column, automation::Rect& rect) const override
     {
