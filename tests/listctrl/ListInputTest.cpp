@@ -84,23 +84,19 @@ protected:
         m_rows->LayoutIfNeeded();
         const long item = verb == "key" || verb == "scroll" ? 0 : Item(arg);
         wxKeyEvent key(wxEVT_KEY_DOWN);
+        wxScrollWinEvent scroll(verb == "scroll" ? code(arg) : 0, 0, wxVERTICAL);
         wxMouseEvent mouse(verb == "key" || verb == "scroll" ? wxEVT_NULL : code(verb));
         static_cast<wxKeyboardState&>(key) = static_cast<wxKeyboardState&>(mouse) = modifiers;
-        if (verb == "select" || verb == "focus" || verb == "clear")
-            m_list->SetItemState(item,
-                                 verb == "select"  ? wxLIST_STATE_SELECTED
-                                 : verb == "focus" ? all
-                                                   : 0,
-                                 verb == "select" ? wxLIST_STATE_SELECTED : all);
+        if (verb == "select")
+            m_list->SetItemState(item, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED);
+        else if (verb == "focus" || verb == "clear")
+            m_list->SetItemState(item, verb == "focus" ? all : 0, all);
         else if (verb == "count")
             m_list->SetItemCount(item);
         else if (verb == "top")
             m_rows->ScrollToTop(item);
         else if (verb == "scroll")
-        {
-            wxScrollWinEvent scroll(code(arg), 0, wxVERTICAL);
             m_rows->ProcessWindowEvent(scroll);
-        }
         else if (verb == "key" && ((key.m_keyCode = code(arg))))
             m_rows->ProcessWindowEvent(key);
         else
@@ -168,13 +164,15 @@ TEST_F(ListInput, SingleSelectionKeysWheelAndScrollbar)
 {
     Build(wxLC_SINGLE_SEL, 200);
     Run("click 2|F2 S2|2 @2; click c+5|D2 F5 S5|5; click 5||5; key c+a|K5|5; select 7|D5 S7|7 @5;"
-        "rclick 3|D7 F3 S3 R3|3 @3; clear 3|*|; key pgdn|*|p-1 @p-1; clear p-1|*|; top 50||^50;"
-        "key pgup|*|50; clear 50|*|^50; top 0||; key down|K-1 F0 S0|0; key down|K0 D0 F1 S1|1;"
-        "key up|*|0 @0; key pgdn|*|p-1 ^0; key pgdn|*|2p-2 ^p-1; key pgup|*|p-1 ^p-1; key end|*|199 ^$;"
-        "key down|*|199; key home|*|0 ^0; clear 0|*|; wheel -120||^3; wheel -60||^3; wheel -60||^6; wheel "
-        "1200||^0;"
-        "wheel -30000||^$; scroll top||^0; scroll linedown||^1; scroll pagedown||^p+1; scroll lineup||^p;"
-        "scroll pageup||^0; scroll bottom||^$;");
+        "rclick 3|D7 F3 S3 R3|3 @3; clear 3|*|; key pgdn|*|p-1 @p-1; clear p-1|*|; top 50||^50; key "
+        "pgup|*|50;"
+        "clear 50|*|^50; top 0||; key down|K-1 F0 S0|0; key down|K0 D0 F1 S1|1; key up|*|0 @0; key "
+        "pgdn|*|p-1 ^0;"
+        "key pgdn|*|2p-2 ^p-1; key pgup|*|p-1 ^p-1; key end|*|199 ^$; key down|*|199; key home|*|0 ^0; clear "
+        "0|*|;"
+        "wheel -120||^3; wheel -60||^3; wheel -60||^6; wheel 1200||^0; wheel -30000||^$; scroll top||^0;"
+        "scroll linedown||^1; scroll pagedown||^p+1; scroll lineup||^p; scroll pageup||^0; scroll "
+        "bottom||^$;");
 }
 
 TEST_F(ListInput, MultipleSelectionByMouseAndKeys)
@@ -220,7 +218,6 @@ TEST_F(ListInput, ItemsBeyondTheCountAreLeftAlone)
         Build(style, 5);
         for (const long item : {5L, 6L})
         {
-            SCOPED_TRACE(testing::Message() << "style " << style << ", item " << item);
             wxRect rect;
             EXPECT_FALSE(m_list->SetItemState(item, wxLIST_STATE_SELECTED, wxLIST_STATE_SELECTED) ||
                          m_list->SetItem(item, 0, wxS("x")) || m_list->DeleteItem(item) ||
@@ -228,7 +225,8 @@ TEST_F(ListInput, ItemsBeyondTheCountAreLeftAlone)
                          m_list->GetItemState(item, wxLIST_STATE_SELECTED));
             m_rows->SetItemSelected(item, true);
             m_rows->SetCurrent(item);
-            EXPECT_EQ(m_list->GetItemText(item) + wxString::Format("%ld", m_list->GetItemCount()), wxS("5"));
+            EXPECT_EQ(m_list->GetItemText(item) + wxString::Format("%ld", m_list->GetItemCount()), wxS("5"))
+                << item;
             Run("top 0||@-1;");
         }
         m_frame->Destroy();
@@ -253,9 +251,5 @@ TEST_F(ListInput, HeaderClicksDraggedBordersAndSidewaysScrolling)
     EXPECT_EQ(PixelAt(RenderRows(m_list, true), range - 740, 12), border) << "edges moved left";
     m_rows->ScrollToX(100000);
     EXPECT_EQ(m_rows->GetScrollX(), range - client) << "no scrolling past the last column";
-    m_list->SetColumnWidth(2, 600);
-    m_rows->LayoutIfNeeded();
-    EXPECT_EQ(m_rows->GetScrollRange(wxHORIZONTAL), range - 100);
-    EXPECT_EQ(m_rows->GetScrollX(), range - 100 - client);
 }
 } // namespace
