@@ -17,12 +17,10 @@ namespace
 {
 
 // gettext's msgcmp: every key of the reference has a translation in the other
-// file, neither fuzzy nor empty unless `untranslated` lets it be.
-int Compare(const std::string& file, const std::string& reference, bool untranslated = false)
+// file, neither fuzzy nor empty unless the options let it be.
+int Compare(const std::string& file, const std::string& reference, const std::string& options = "")
 {
-    return std::system(("msgcmp " + std::string(untranslated ? "--use-untranslated '" : "'") + file + "' '" +
-                        reference + "'")
-                           .c_str());
+    return std::system(("msgcmp " + options + " '" + file + "' '" + reference + "'").c_str());
 }
 
 // Each language finds its own catalog, not a neighbour's (zh_TW is not zh_CN),
@@ -48,7 +46,6 @@ TEST(CatalogTest, EveryLanguageLoadsItsOwnCompleteCatalogThroughTheLocale)
         ASSERT_TRUE(locale.Init(uilanguage::LanguageOfLocaleName(name), wxLOCALE_DONT_LOAD_DEFAULT))
             << "the system lacks the locale (Debian: locales-all)";
         ASSERT_TRUE(locale.AddCatalog("wyx3"));
-        ASSERT_EQ(completeLog.count(name), 1u) << "no known text";
         EXPECT_EQ(wxGetTranslation("Complete Log").utf8_string(), completeLog.at(name));
         const wxString footer = wxGetTranslation("[WYX3Value1] of [WYX3Value2] items selected.");
         EXPECT_EQ(wxString(footer).Replace("[WYX3Value1]", ""), 1u) << footer;
@@ -61,7 +58,8 @@ TEST(CatalogTest, TheTemplateHoldsExactlyTheTextsTheSourcesTranslate)
     TempFolder folder;
     const std::string extracted = (folder.Path() / "extracted.pot").string();
     ASSERT_EQ(std::system((std::string("'") + WYX_EXTRACT_TEMPLATE + "' '" + extracted + "'").c_str()), 0);
-    EXPECT_TRUE(Compare(extracted, WYX_TEMPLATE, true) == 0 && Compare(WYX_TEMPLATE, extracted, true) == 0)
+    EXPECT_TRUE(Compare(extracted, WYX_TEMPLATE, "--use-untranslated") == 0 &&
+                Compare(WYX_TEMPLATE, extracted, "--use-untranslated") == 0)
         << "update it: cmake --build <build folder> --target wyx_update_template";
 }
 
