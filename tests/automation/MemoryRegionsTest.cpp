@@ -10,18 +10,6 @@ using namespace automation;
 namespace
 {
 
-TEST(MemoryMap, ReadsRangesAndAccessAndSkipsWhatIsNoRegion)
-{
-    const std::vector<MemoryRegion> regions =
-        ParseMemoryMap("55d0c0a00000-55d0c0a21000 rw-p 00000000 00:00 0  [heap]\n"
-                       "not a line\n10-8 rw-p 0 0 0\n20-30 rwzp 0 0 0\n"
-                       "7f00aa000000-7f00aa001000 ---p 00000000 00:00 0");
-    ASSERT_EQ(regions.size(), 2u);
-    EXPECT_EQ(std::pair(regions[0].begin, regions[0].end), std::pair(0x55d0c0a00000ul, 0x55d0c0a21000ul));
-    EXPECT_TRUE(regions[0].readable && regions[0].writable && !regions[0].executable);
-    EXPECT_FALSE(regions[1].readable || regions[1].writable || regions[1].executable);
-}
-
 TEST(PointerCheck, AStructureMustLieWhollyInOneAccessibleRegion)
 {
     MemoryRegion noAccess{0x1000, 0x2000, false, false, false, false};
