@@ -61,79 +61,64 @@ struct Scene
 };
 
 // Runs before any configuration is loaded (the store keeps the first value it
-// meets for a key): without a choice the setting is "0".
-TEST(FolderErrors, ClearLogClearsEveryMarkerAndRefreshesAsTheSettingSays)
+// meets for a key): without a choice the setting is "0". The marker of
+// folders[1] cannot be removed: a folder of that name with something in it.
+TEST(FolderErrors, AcknowledgingAndClearLogRemoveTheMarkersAndRefreshAsTheSettingSays)
 {
     EXPECT_EQ("0", ReadIconRefreshSetting());
     struct Mode
     {
         const char* setting; // nullptr: the configuration's
         bool folderIcons;    // else no icon is refreshed and the error folders stay known
-        unsigned shellNotifications;
+        bool shellNotification;
     };
-    for (const Mode& mode : {Mode{nullptr, true, 0}, Mode{"1", false, 1}, Mode{"2", false, 0}})
+    for (const Mode& mode : {Mode{nullptr, true, false}, Mode{"1", false, true}, Mode{"2", false, false}})
     {
         SCOPED_TRACE(mode.setting ? mode.setting : "default");
         Scene scene;
         if (mode.setting)
             scene.UseSetting(mode.setting);
-        scene.model.ClearLog();
-        EXPECT_FALSE(Scene::IsMarked(scene.folders[0]) || Scene::IsMarked(scene.folders[1]) ||
-                     Scene::IsMarked(scene.folders[2]));
-        EXPECT_EQ(mode.shellNotifications, wyxos::ShellNotificationCount());
+        const wxString stuck = ErrorMarkerPath(scene.folders[1]);
+        wxRemoveFile(stuck);
+        ASSERT_TRUE(wxFileName::Mkdir(stuck));
+        SystemRoot::WriteFile(stuck + "/inside", "x");
+        EXPECT_EQ(NoErrorMarker,
+                  scene.model.AcknowledgeFolderErrors(scene.root.Path() + "/srv/hotfolders/Unknown"));
+        EXPECT_EQ(ErrorMarkerRemoved, scene.model.AcknowledgeFolderErrors(scene.folders[2]));
+        EXPECT_EQ(NoErrorMarker, scene.model.AcknowledgeFolderErrors(scene.folders[2]));
+        EXPECT_EQ(ErrorMarkerKept, scene.model.AcknowledgeFolderErrors(scene.folders[1]));
+        EXPECT_TRUE(Scene::IsMarked(scene.folders[0]) && Scene::IsMarked(scene.folders[1]));
+        EXPECT_FALSE(Scene::IsMarked(scene.folders[2]));
+        const std::vector<wxString> none;
         const std::vector<wxString> refreshed = {scene.folders[2], scene.folders[1]};
-        EXPECT_EQ(mode.folderIcons ? refreshed : std::vector<wxString>(), scene.IconCalls());
+        EXPECT_EQ(mode.folderIcons ? refreshed : none, scene.IconCalls());
+        EXPECT_EQ(mode.shellNotification ? 2u : 0u, wyxos::ShellNotificationCount());
+
+        scene.model.ClearLog();
+        EXPECT_FALSE(Scene::IsMarked(scene.folders[0]) || Scene::IsMarked(scene.folders[2]));
+        EXPECT_TRUE(Scene::IsMarked(scene.folders[1]));
+        EXPECT_EQ(mode.shellNotification ? 3u : 0u, wyxos::ShellNotificationCount());
+        const std::vector<wxString> again = {scene.folders[2], scene.folders[1], scene.folders[2],
+                                             scene.folders[1]};
+        EXPECT_EQ(mode.folderIcons ? again : none, scene.IconCalls()) << "the error folders refreshed again";
         EXPECT_EQ(mode.folderIcons ? 0u : 2u, scene.model.GetErrorFolders().size());
 
         // Nothing failed since: the next reset clears a new marker but refreshes no icon.
-        const std::size_t calls = scene.IconCalls().size();
         Scene::Mark(scene.folders[0]);
         scene.model.ResetAllFolderErrors();
         EXPECT_FALSE(Scene::IsMarked(scene.folders[0]));
-        EXPECT_EQ(calls, scene.IconCalls().size());
+        EXPECT_EQ(mode.folderIcons ? 4u : 0u, scene.IconCalls().size());
     }
-}
-
-// The marker of folders[1] cannot be removed: a folder of that name with something in it.
-TEST(FolderErrors, AcknowledgingClearsAMarkedFolderAndRefreshesItAloneEvenWhenTheMarkerStays)
-{
-    Scene scene;
-    wxArrayString names = logtest::Strings({"stale"});
-    EXPECT_EQ(1, scene.model.GetHotFolderNames(names));
-    EXPECT_EQ((std::vector<wxString>{"In", "PDF Proofs", "Tiffs"}),
-              std::vector<wxString>(names.begin(), names.end()));
-    EXPECT_EQ(NoErrorMarker,
-              scene.model.AcknowledgeFolderErrors(scene.root.Path() + "/srv/hotfolders/Unknown"));
-    EXPECT_TRUE(scene.IconCalls().empty());
-
-    const wxString stuck = ErrorMarkerPath(scene.folders[1]);
-    wxRemoveFile(stuck);
-    ASSERT_TRUE(wxFileName::Mkdir(stuck));
-    SystemRoot::WriteFile(stuck + "/inside", "x");
-    scene.UseSetting("0");
-    EXPECT_EQ(ErrorMarkerRemoved, scene.model.AcknowledgeFolderErrors(scene.folders[2]));
-    EXPECT_EQ(NoErrorMarker, scene.model.AcknowledgeFolderErrors(scene.folders[2]));
-    EXPECT_EQ(ErrorMarkerKept, scene.model.AcknowledgeFolderErrors(scene.folders[1]));
-    EXPECT_FALSE(Scene::IsMarked(scene.folders[2]));
-    EXPECT_TRUE(Scene::IsMarked(scene.folders[1]));
-    EXPECT_TRUE(Scene::IsMarked(scene.folders[0]));
-    EXPECT_EQ((std::vector<wxString>{scene.folders[2], scene.folders[1]}), scene.IconCalls());
-    EXPECT_EQ(2u, scene.model.GetErrorFolders().size());
-
-    scene.UseSetting("1");
-    EXPECT_EQ(ErrorMarkerRemoved, scene.model.AcknowledgeFolderErrors(scene.folders[0]));
-    EXPECT_EQ(NoErrorMarker, scene.model.AcknowledgeFolderErrors(scene.folders[0]));
-    EXPECT_EQ(1u, wyxos::ShellNotificationCount());
-    EXPECT_EQ(2u, scene.IconCalls().size());
-    scene.model.ClearLog();
-    EXPECT_TRUE(Scene::IsMarked(scene.folders[1]));
-    EXPECT_EQ(2u, wyxos::ShellNotificationCount());
 }
 
 // Last: it loads a configuration for the rest of the process.
 TEST(FolderErrors, TheSettingComesFromTheConfiguration)
 {
     Scene scene;
+    wxArrayString names = logtest::Strings({"stale"});
+    EXPECT_EQ(1, scene.model.GetHotFolderNames(names));
+    EXPECT_EQ("In|PDF Proofs|Tiffs", wxJoin(names, '|', 0))
+        << "the hot folders' names are their last path components";
     const wxString config = scene.root.Path() + "/WyxConfig.cfg";
     SystemRoot::WriteFile(
         config, "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<Configuration><WyxConfiguration>"
