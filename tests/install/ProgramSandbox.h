@@ -37,7 +37,7 @@ public:
             environment.push_back("NO_AT_BRIDGE=1");
         for (const char* name :
              {"DISPLAY", "PATH", "XAUTHORITY", accessibility ? "DBUS_SESSION_BUS_ADDRESS" : ""})
-            if (const char* value = *name ? ::getenv(name) : nullptr)
+            if (const char* value = ::getenv(name))
                 environment.push_back(std::string(name) + "=" + value);
     }
 
@@ -69,8 +69,7 @@ public:
     void Close(Program& program, Window window)
     {
         x.RequestClose(window);
-        const int status = program.Wait();
-        EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0) << program.Outcome();
+        EXPECT_EQ(program.Wait(), 0) << program.Outcome(); // exit code 0, not a signal
     }
 
     TempFolder folder;
