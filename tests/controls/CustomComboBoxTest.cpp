@@ -40,10 +40,8 @@ protected:
         auto* view = new wxPanel(frame);
         combo = new CustomComboBox;
         ASSERT_TRUE(combo->Create(view, 5006, wxPoint(10, 10), wxSize(150, -1)));
-        for (const char* item :
-             {"All Servers      ", "Beta", "A server with a rather long name that cannot fit"})
-            combo->Append(item);
-        combo->SetSelection(0);
+        const char* items[] = {"All Servers      ", "Beta", "A server with a name too long to fit"};
+        combo->Append(wxArrayString(3, items));
         view->Bind(
             wxEventTypeTag<wxCommandEvent>(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK), [this](wxCommandEvent& e)
             { log += wxString::Format("click %d%s;", e.GetId(), combo->IsPopupShown() ? " shown" : ""); });
@@ -61,24 +59,10 @@ protected:
         guitest::Pump(0);
     }
 
-    void Show()
-    {
-        combo->Bind(wxEVT_PAINT, [this](wxPaintEvent& event) { painted = true, event.Skip(); });
-        frame->Show();
-        ASSERT_TRUE(guitest::PumpUntil([this] { return painted; }));
-    }
-
     void Send(wxEvent&& event)
     {
         event.SetEventObject(combo);
         combo->GetEventHandler()->ProcessEvent(event);
-    }
-
-    void Press(int code)
-    {
-        wxKeyEvent press(wxEVT_KEY_DOWN);
-        press.m_keyCode = code;
-        Send(std::move(press));
     }
 
     wxFrame* frame = nullptr;
@@ -89,28 +73,30 @@ protected:
 
 TEST_F(ComboBox, ClosedBoxDrawsTheShortenedTextInsideTheInsetAndPopupRowsTheWholeText)
 {
-    const wxSize size(120, 26);
+    const wxRect area(0, 0, 120, 26);
+    // What OnDrawItem draws against `shown` drawn at (x, 3): the first difference, or "".
+    const auto compare = [&](int index, int flags, const wxString& shown, int x)
+    {
+        const auto paint = [&](bool item)
+        {
+            return pixels::Render(area.GetSize(), *wxWHITE,
+                                  [&](wxDC& dc)
+                                  {
+                                      dc.SetFont(combo->GetFont());
+                                      dc.SetTextForeground(*wxBLACK);
+                                      item ? combo->OnDrawItem(dc, area, index, flags)
+                                           : dc.DrawText(shown, x, 3);
+                                  });
+        };
+        return pixels::FirstDifference(paint(true), paint(false));
+    };
     const wxString text = combo->GetString(2);
     const wxString shortened = CustomComboBox::ShortenToWidth(
-        text, size.x - 6, [this](const wxString& s) { return combo->GetTextExtent(s).x; });
-    const auto paint = [&](const std::function<void(wxDC&)>& draw)
-    {
-        return pixels::Render(size, *wxWHITE,
-                              [&](wxDC& dc)
-                              {
-                                  dc.SetFont(combo->GetFont());
-                                  dc.SetTextForeground(*wxBLACK);
-                                  draw(dc);
-                              });
-    };
-    const auto item = [&](int index, int flags)
-    { return paint([&](wxDC& dc) { combo->OnDrawItem(dc, wxRect(size), index, flags); }); };
-    const auto drawn = [&](const wxString& shown, int x)
-    { return paint([&](wxDC& dc) { dc.DrawText(shown, x, 3); }); };
+        text, area.width - 6, [this](const wxString& s) { return combo->GetTextExtent(s).x; });
     ASSERT_TRUE(shortened.EndsWith("..."));
-    EXPECT_EQ(pixels::FirstDifference(item(2, wxODCB_PAINTING_CONTROL), drawn(shortened, 4)), "");
-    EXPECT_EQ(pixels::FirstDifference(item(2, 0), drawn(text, 3)), "") << "one pixel further left";
-    EXPECT_EQ(pixels::FirstDifference(item(3, 0), drawn("", 0)), "") << "an index past the end";
+    EXPECT_EQ(compare(2, wxODCB_PAINTING_CONTROL, shortened, 4), "");
+    EXPECT_EQ(compare(2, 0, text, 3), "") << "one pixel further left";
+    EXPECT_EQ(compare(3, 0, "", 0), "") << "an index past the end";
 }
 
 class ComboPress : public ComboBox, public testing::WithParamInterface<int>
@@ -122,9 +108,11 @@ class ComboPress : public ComboBox, public testing::WithParamInterface<int>
 // itself, so each reaches the box's own handler once.
 TEST_P(ComboPress, AnnouncesItselfToTheViewOnceBeforeThePopupOpens)
 {
-    Show();
-    const wxSize size = combo->GetClientSize();
-    const wxPoint at = combo->ClientToScreen(wxPoint(GetParam() == 1 ? size.x - 6 : 10, size.y / 2));
+    combo->Bind(wxEVT_PAINT, [this](wxPaintEvent& event) { painted = true, event.Skip(); });
+    frame->Show();
+    ASSERT_TRUE(guitest::PumpUntil([this] { return painted; }));
+    const wxPoint at =
+        combo->ClientToScreen({GetParam() ? combo->GetClientSize().x - 6 : 10, combo->GetClientSize().y / 2});
     wxUIActionSimulator input;
     input.MouseMove(at);
     guitest::PumpUntil([&] { return wxGetMousePosition() == at; });
@@ -136,29 +124,23 @@ TEST_P(ComboPress, AnnouncesItselfToTheViewOnceBeforeThePopupOpens)
 INSTANTIATE_TEST_SUITE_P(ComboPresses, ComboPress, testing::Values(0, 1));
 
 // Enter posts the button event to the view; other keys go on to the library, which moves the
-// selection with the arrows. A selection reaches the view with the control's value; the tooltip,
-// when asked for, shows it.
-TEST_F(ComboBox, KeysSelectionAndTooltip)
+// selection with the arrows. A selection reaches the view with the control's value.
+TEST_F(ComboBox, EnterPostsTheButtonEventAndSelectionsCarryTheControlValue)
 {
     for (const int key : {int(WXK_RETURN), int(WXK_NUMPAD_ENTER), int(WXK_ESCAPE), int(WXK_DOWN)})
     {
-        Press(key);
+        wxKeyEvent press(wxEVT_KEY_DOWN);
+        press.m_keyCode = key;
+        Send(std::move(press));
         wxTheApp->ProcessPendingEvents();
     }
-    EXPECT_EQ(log, "button 5100;button 5100;select 5006 Beta;");
+    EXPECT_EQ(log, "button 5100;button 5100;select 5006 All Servers      ;");
     log.clear();
     combo->SetSelection(2);
     wxCommandEvent selected(wxEVT_COMBOBOX, combo->GetId());
     selected.SetString("stale");
     Send(std::move(selected));
     EXPECT_EQ(log, "select 5006 " + combo->GetString(2) + ";");
-    for (const bool shown : {true, false})
-    {
-        combo->SetToolTip("left over");
-        combo->SetShowTooltip(shown);
-        Send(wxMouseEvent(wxEVT_MOTION));
-        EXPECT_EQ(combo->GetToolTipText(), shown ? combo->GetString(2) : "");
-    }
 }
 
 } // namespace

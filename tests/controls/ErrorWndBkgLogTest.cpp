@@ -19,16 +19,14 @@ namespace
 // Lines as "x,y:text|"; each text begins with a space.
 TEST(ErrorPanel, PlacesTheLines)
 {
-    const std::tuple<const char*, int, int, const char*> cases[] = {
-        {" \t\r\n  ", 300, 16, ""},
-        {"  Disk\r\n \t\t full \n", 300, 16, "109,4: Disk full|"},
-        {"aaaa bbbb cccc dddd", 300, 16, "109,4: aaaa bbbb cccc|4,20: dddd|"},
-        {"a verylongwordthatoverflows b", 120, 16,
-         "109,4:|4,20: a|4,36: verylongwordthatoverflows|4,52: b|"}};
-    for (const auto& [text, width, lineHeight, expected] : cases)
+    const std::tuple<const char*, int, const char*> cases[] = {
+        {"  Disk\r\n \t\t full \n", 300, "109,4: Disk full|"},
+        {"aaaa bbbb cccc dddd", 300, "109,4: aaaa bbbb cccc|4,20: dddd|"},
+        {"a verylongwordthatoverflows b", 120, "109,4:|4,20: a|4,36: verylongwordthatoverflows|4,52: b|"}};
+    const auto measure = [](const wxString& line)
+    { return wxSize(10 * static_cast<int>(line.length()), 16); };
+    for (const auto& [text, width, expected] : cases)
     {
-        const auto measure = [height = lineHeight](const wxString& line)
-        { return wxSize(10 * static_cast<int>(line.length()), height); };
         std::string laidOut;
         for (const ErrorDetailLine& line :
              LayoutErrorDetail(SplitErrorDetailWords(text), 100, width, measure))
