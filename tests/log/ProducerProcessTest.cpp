@@ -7,7 +7,6 @@
 
 #include "LogTestSupport.h"
 #include "data/JobLogManager.h"
-#include "data/JobReadWriter.h"
 
 namespace
 {
@@ -56,11 +55,8 @@ TEST(LogModelBesideAProducerProcess, ListsEveryJobExactlyOnceAcrossTrimming)
     model.Parse();
     ASSERT_EQ(0, producerStatus);
 
-    wyx::JobsFileReadWriter journal;
-    journal.SetPath(root.JournalPath());
-    wxArrayString lines;
-    ASSERT_EQ(wyx::JobOk, journal.ReadJobs(lines));
-    EXPECT_LT(lines.size(), 10000u) << "the journal was trimmed";
+    EXPECT_LT(wxFileName::GetSize(root.JournalPath()), wxULongLong(seed.utf8_str().length()))
+        << "the journal was trimmed";
     // Only seed-* and job-* keys were written: as many distinct keys as records means each once.
     std::vector<JobRecord> records;
     model.GetAllRecords(records);
