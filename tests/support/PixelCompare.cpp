@@ -9,12 +9,11 @@ namespace pixels
 wxImage Render(const wxSize& size, const wxColour& background, const std::function<void(wxDC&)>& paint)
 {
     wxBitmap bitmap(size, 24);
-    {
-        wxMemoryDC dc(bitmap);
-        dc.SetBackground(wxBrush(background));
-        dc.Clear();
-        paint(dc);
-    }
+    wxMemoryDC dc(bitmap);
+    dc.SetBackground(wxBrush(background));
+    dc.Clear();
+    paint(dc);
+    dc.SelectObject(wxNullBitmap); // the bitmap holds the picture once the DC lets go of it
     return bitmap.ConvertToImage();
 }
 

@@ -45,8 +45,7 @@ class ScopedEnv
 public:
     ScopedEnv(const char* name, const std::string& value) : m_name(name)
     {
-        if (const char* old = ::getenv(name))
-            m_old = old;
+        m_old = ::getenv(name) ? std::optional<std::string>(::getenv(name)) : std::nullopt;
         ::setenv(name, value.c_str(), 1);
     }
     ~ScopedEnv() { m_old ? ::setenv(m_name.c_str(), m_old->c_str(), 1) : ::unsetenv(m_name.c_str()); }
