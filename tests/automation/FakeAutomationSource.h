@@ -29,10 +29,9 @@ struct FakeSource : automation::AutomationSource
     automation::ControlKind Kind() const override { return kind; }
     std::uintptr_t Handle() const override { return handle; }
     long ItemCount() const override { return static_cast<long>(rows.size()); }
-    std::u16string ItemText(long item, int column) const override
+    std::u16string ItemText(long item, int column) const override // negative positions wrap to none
     {
-        const bool in =
-            item >= 0 && item < ItemCount() && column >= 0 && size_t(column) < rows[size_t(item)].size();
+        const bool in = size_t(item) < rows.size() && size_t(column) < rows[size_t(item)].size();
         return in ? rows[size_t(item)][size_t(column)] : u"";
     }
     long Current() const override { return current; }
@@ -40,7 +39,7 @@ struct FakeSource : automation::AutomationSource
     long LastVisible() const override { return lastVisible; }
     unsigned ItemState(long item) const override
     {
-        return item >= 0 && size_t(item) < states.size() ? states[size_t(item)] : 0;
+        return size_t(item) < states.size() ? states[size_t(item)] : 0;
     }
     int ItemImage(long item, int column) const override { return column == 1 ? 7 : -1; }
     std::intptr_t ItemData(long item) const override { return 1000 + item; }
@@ -71,9 +70,7 @@ struct FakeSource : automation::AutomationSource
     int ColumnCount() const override { return static_cast<int>(columns.size()); }
     bool Column(int column, automation::ColumnInfo& info) const override
     {
-        const bool in = column >= 0 && size_t(column) < columns.size();
-        info = in ? columns[size_t(column)] : info;
-        return in;
+        return size_t(column) < columns.size() && (info = columns[size_t(column)], true);
     }
     int ScrolledLeft() const override { return scrolledLeft; }
     int ItemHeight(long) const override { return 18; }

@@ -20,8 +20,7 @@ namespace
 
 using Answer = std::optional<std::intptr_t>;
 constexpr unsigned kKind = 0xC123, kSelFoc = kLvisSelected | kLvisFocused, kSt = 0x00030000;
-constexpr std::uintptr_t kNone = std::uintptr_t(-1);
-constexpr size_t kReadOnly = 2048;
+constexpr std::uintptr_t kNone = std::uintptr_t(-1), kReadOnly = 2048;
 const Answer kNo = std::nullopt;
 
 // A job list with its header, a combo box and its popup list, and the memory
@@ -70,18 +69,17 @@ TEST(QueryAnswers, EachControlAnswersItsOwnMessagesInRangeAndNoOthers)
     // clang-format off
     const struct { FakeSource Fixture::*to; unsigned message; std::uintptr_t wParam; std::intptr_t lParam;
                    Answer answer; } cases[] = {
-        {L, kLvmGetItemCount, 0, 0, 3}, {L, kLvmGetHeader, 0, 0, 0x2000}, {L, kLvmGetTopIndex, 0, 0, 1},
+        {L, kLvmGetItemCount, 0, 0, 3}, {L, kLvmGetHeader, 0, 0, 0x2000},
         {L, kLvmGetItemState, 1, kLvisFocused, 0}, {L, kLvmGetItemState, 2, kSelFoc, 1},
         {L, kLvmGetItemState, 3, kSelFoc, kNo}, {L, kLvmGetSelectedCount, 0, 0, 0},
         {L, kLvmColumnCountQuery, 2, 0, 3}, {L, kLvmColumnCountQuery, 3, 0, kNo},
-        {L, kLvmZeroItemQuery, 0, 0, 0}, {L, kLvmZeroItemQuery, 3, 0, kNo}, {L, kLvmZeroQuery, 99, 0, 0},
-        {L, kHdmGetItemCount, 0, 0, 3}, {L, kCbGetCount, 0, 0, kNo}, {L, kKind, 5, 0, 0},
-        {L, kKind, kKindQuery, 8, 0}, {L, kLvmGetItemW, 0, 8, kNo}, {H, kHdmGetItemCount, 0, 0, 3},
-        {H, kLvmGetItemCount, 0, 0, kNo}, {H, kKind, kKindQuery, 0, kNo}, {C, kCbGetCount, 0, 0, 4},
-        {C, kCbGetCurSel, 0, 0, 1}, {C, kCbGetDroppedState, 0, 0, 0}, {C, kLbGetCount, 0, 0, kNo},
-        {C, kCbGetLbTextLen, 3, 0, 5}, {C, kCbGetLbTextLen, 4, 0, -1}, {C, kCbGetLbTextLen, kNone, 0, -1},
-        {C, kCbGetLbText, 1, 0, -1}, {C, kCbFindStringExact, 1, 0, -1}, {C, kCbGetComboBoxInfo, 0, 8, -1},
-        {P, kLbGetTopIndex, 0, 0, 1}, {P, kLbGetCurSel, 0, 0, 1}, {P, kLbGetCount, 0, 0, 4},
+        {L, kLvmZeroItemQuery, 0, 0, 0}, {L, kLvmZeroItemQuery, 3, 0, kNo}, {L, kHdmGetItemCount, 0, 0, 3},
+        {L, kCbGetCount, 0, 0, kNo}, {L, kKind, 5, 0, 0}, {L, kKind, kKindQuery, 8, 0},
+        {L, kLvmGetItemW, 0, 8, kNo}, {H, kHdmGetItemCount, 0, 0, 3}, {H, kLvmGetItemCount, 0, 0, kNo},
+        {H, kKind, kKindQuery, 0, kNo}, {C, kCbGetCount, 0, 0, 4}, {C, kCbGetCurSel, 0, 0, 1},
+        {C, kCbGetDroppedState, 0, 0, 0}, {C, kLbGetCount, 0, 0, kNo}, {C, kCbGetLbTextLen, 3, 0, 5},
+        {C, kCbGetLbTextLen, 4, 0, -1}, {C, kCbGetLbText, 1, 0, -1}, {C, kCbFindStringExact, 1, 0, -1},
+        {C, kCbGetComboBoxInfo, 0, 8, -1}, {P, kLbGetTopIndex, 0, 0, 1}, {P, kLbGetCount, 0, 0, 4},
         {P, kLbGetTextLen, 3, 0, 5}, {P, kLbGetText, 4, 0, -1}, {P, kLbGetText, 1, 0, -1},
         {P, kCbGetCount, 0, 0, kNo}};
     // clang-format on
@@ -112,7 +110,7 @@ TEST(QueryAnswers, EachControlAnswersItsOwnMessagesInRangeAndNoOthers)
     EXPECT_EQ(f.Ask(f.popup, kLbGetItemRect, 2, f.Address(0)), 1) << "an entry in view";
 }
 
-TEST(QueryAnswers, TheKindNameGoesOnlyIntoAWritableBufferWithRoomForItAndItsTerminator)
+TEST(QueryAnswers, TextsGoOnlyIntoWritableBuffersWithRoomForThemAndTheirTerminatorsAndSearchesStayInBounds)
 {
     Fixture f;
     const auto kind = [&](const FakeSource& to, std::uint16_t capacity, size_t at = 0)
@@ -127,11 +125,7 @@ TEST(QueryAnswers, TheKindNameGoesOnlyIntoAWritableBufferWithRoomForItAndItsTerm
     EXPECT_EQ(kind(f.list, 8), Kind(0, u"\u0008"));
     EXPECT_EQ(kind(f.list, 64, kReadOnly), Kind(0, u"\u0040"));
     EXPECT_EQ(kind(f.list, 1100), Kind(0, u"\u044c"));
-}
 
-TEST(QueryAnswers, ListItemsFillTheAskedFieldsReportOnlyThoseAndCutTheirText)
-{
-    Fixture f;
     // A list item into an LVITEMW at the start, its text buffer at 512 (or read-only).
     const auto item = [&](unsigned mask, int row, int column, int capacity, size_t textAt = 512)
     {
@@ -148,14 +142,8 @@ TEST(QueryAnswers, ListItemsFillTheAskedFieldsReportOnlyThoseAndCutTheirText)
     EXPECT_EQ(std::get<0>(item(kLvifText, 3, 0, 64)), kNo);
     EXPECT_EQ(item(kLvifText | kLvifImage, 0, 0, 16, kReadOnly),
               Item(kNo, u"untouched", kLvifText | kLvifImage, kSt, -9, 0));
-    EXPECT_EQ(f.Ask(f.list, kLvmGetItemW, 0, f.Address(kReadOnly)), kNo);
-}
 
-// The popup list answers through the same routines.
-TEST(QueryAnswers, BoxEntriesAreCopiedAndFoundOnlyWithinTheCallersMemory)
-{
-    Fixture f;
-    // "PRN-01" needs 14 bytes: placed 14 bytes before the writable half ends, then 12.
+    // A box's entry: "PRN-01" needs 14 bytes: placed 14 bytes before the writable half ends, then 12.
     EXPECT_EQ(f.Ask(f.combo, kCbGetLbText, 1, f.Address(2048 - 14)), 6);
     EXPECT_EQ(f.Text(2048 - 14), u"PRN-01");
     EXPECT_EQ(f.Ask(f.combo, kCbGetLbText, 1, f.Address(2048 - 12)), -1);
