@@ -1,5 +1,7 @@
 // One pass of the registered notifier reaches both models, and stopping the
 // listeners reaches them too: the wiring between the pump and the data layer.
+#include <tuple>
+
 #include <gtest/gtest.h>
 
 #include <wx/log.h>
@@ -23,52 +25,41 @@ TEST(JobsProgressNotify, OnePassRefreshesBothModelsAndStoppingReachesBoth)
     wxLog::EnableLogging(false);
     wyxtest::SystemRoot root;
     const wxString logJournal = GetDataDirectory() + "TiveraJobsLogFile.txt";
-    wyxtest::SystemRoot::WriteFile(GetDataDirectory() + "TiveraJobsStatusFile.txt",
-                                   statustest::StatusLine("7", "ADDED") + "\r\n");
+    const wxString statusJournal = GetDataDirectory() + "TiveraJobsStatusFile.txt";
+    wyxtest::SystemRoot::WriteFile(statusJournal, statustest::StatusLine("7", "ADDED") + "\r\n");
     wyxtest::SystemRoot::WriteFile(logJournal,
                                    logtest::LogLine("5", "ADDED") + logtest::LogLine("6", "ADDED", "Failed"));
 
-    int logUpdates = 0;
-    int statusUpdates = 0;
+    int logUpdates = 0, statusUpdates = 0;
+    const auto count = [](int& updates) { return [&updates](wxCommandEvent&) { ++updates; }; };
     wxEvtHandler views;
-    views.Bind(wxEventTypeTag<wxCommandEvent>(wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBLOG),
-               [&](wxCommandEvent&) { ++logUpdates; });
-    views.Bind(wxEventTypeTag<wxCommandEvent>(wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS),
-               [&](wxCommandEvent&) { ++statusUpdates; });
+    views.Bind(wxEventTypeTag<wxCommandEvent>(wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBLOG), count(logUpdates));
+    views.Bind(wxEventTypeTag<wxCommandEvent>(wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS), count(statusUpdates));
     ASSERT_TRUE(EventBus::Get().Subscribe(ChannelKey(1), &views));
     ASSERT_TRUE(EventBus::Get().Subscribe(ChannelKey(2), &views));
-    const auto pass = [&](ServerEventListner& listener)
-    {
-        listener.Notify();
-        wxAppConsole::GetInstance()->ProcessPendingEvents();
-    };
-
     ServerEventListner listener;
     JobsProgressNotify notifier;
     ASSERT_TRUE(listener.AddListener("OnNewData", &notifier));
-    pass(listener);
-    EXPECT_EQ(logUpdates, 1);
-    EXPECT_EQ(statusUpdates, 1);
-    std::vector<JobRecord> jobs;
-    JobStatusManager::GetInstance().GetJobs(jobs);
-    ASSERT_EQ(jobs.size(), 1u);
-    EXPECT_EQ(jobs[0][StatusField::Key], "7");
-    EXPECT_EQ(JobLogManager::GetInstance().GetRecordCount(), 2u);
+    // After one pass: the log's records, the status list's jobs, and the updates published so far.
+    const auto pass = [&]
+    {
+        listener.Notify();
+        wxAppConsole::GetInstance()->ProcessPendingEvents();
+        return std::make_tuple(JobLogManager::GetInstance().GetRecordCount(),
+                               JobStatusManager::GetInstance().GetSnapshot()->jobs.size(), logUpdates,
+                               statusUpdates);
+    };
+    using Counts = std::tuple<std::size_t, std::size_t, int, int>;
+    EXPECT_EQ(pass(), Counts(2, 1, 1, 1));
+    EXPECT_EQ(pass(), Counts(2, 1, 1, 1)) << "an unchanged pass publishes nothing";
 
-    // An unchanged pass publishes nothing.
-    pass(listener);
-    EXPECT_EQ(logUpdates, 1);
-    EXPECT_EQ(statusUpdates, 1);
-
-    // Once stopped, the log model takes nothing in, though its journal grew.
+    // Once stopped, neither model takes in what its journal gained: the log
+    // model reads nothing, the status model's read stops at its first line and
+    // keeps what it has.
     listener.SetRunning(false);
     wyxtest::SystemRoot::AppendFile(logJournal, logtest::LogLine("8", "ADDED", "Failed"));
-    pass(listener);
-    EXPECT_EQ(JobLogManager::GetInstance().GetRecordCount(), 2u);
-    EXPECT_EQ(logUpdates, 1);
-
-    EXPECT_EQ(listener.RemoveListener("OnNewData"), &notifier);
-    EventBus::Get().Unsubscribe(&views);
+    wyxtest::SystemRoot::AppendFile(statusJournal, statustest::StatusLine("9", "ADDED") + "\r\n");
+    EXPECT_EQ(pass(), Counts(2, 0, 1, 2));
 }
 
 } // namespace
