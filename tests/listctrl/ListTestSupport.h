@@ -10,7 +10,6 @@
 #include <wx/image.h>
 
 #include <string>
-#include <utility>
 #include <vector>
 
 namespace listtest
