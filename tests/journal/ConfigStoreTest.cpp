@@ -1,4 +1,6 @@
 // The configuration file and the data directory.
+#include <unistd.h>
+
 #include <wx/app.h>
 #include <wx/filename.h>
 
@@ -17,7 +19,7 @@ Lines Values(const ConfigStore& store, const Lines& keys)
     for (const std::string& key : keys)
     {
         wxString value = "-";
-        store.Lookup(JournalTest::FromUtf8(key), value);
+        store.Lookup(wxString::FromUTF8(key), value);
         values.push_back(JournalTest::Utf8(value));
     }
     return values;
@@ -26,27 +28,6 @@ Lines Values(const ConfigStore& store, const Lines& keys)
 std::string InConfiguration(const std::string& entries)
 {
     return "<Configuration><WyxConfiguration>" + entries + "</WyxConfiguration></Configuration>";
-}
-
-struct DocumentCase
-{
-    const char* name;
-    std::string document;
-    Lines keys, values;
-};
-
-class ConfigDocument : public JournalTest, public ::testing::WithParamInterface<DocumentCase>
-{
-};
-
-TEST_P(ConfigDocument, GivesTheEntriesOfTheFirstConfigurationFound)
-{
-    WriteBytes(Root() + "/WyxConfig.cfg", GetParam().document);
-    ConfigStore store, fromMemory;
-    EXPECT_TRUE(store.LoadFile(FromUtf8(Root() + "/WyxConfig.cfg")));
-    EXPECT_EQ(Values(store, GetParam().keys), GetParam().values);
-    fromMemory.LoadDocument(GetParam().document.data(), GetParam().document.size());
-    EXPECT_EQ(Values(fromMemory, GetParam().keys), GetParam().values);
 }
 
 // One configuration holding the entries, and one entry of key A.
@@ -59,101 +40,91 @@ std::string A(const std::string& value)
     return "<E k=\"A\" v=\"" + value + "\"/>";
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    Documents, ConfigDocument,
-    ::testing::Values(
-        DocumentCase{"DirectChild",
-                     "<?xml version=\"1.0\" encoding=\"UTF-8\"?>" +
-                         InConfiguration("<Entry key=\"APP_WYX_VERSION\" value=\"3.3\"/><Entry "
-                                         "key=\"ICON_SHELL_NOTIFY\" value=\"1\"/>"),
-                     {"APP_WYX_VERSION", "ICON_SHELL_NOTIFY"},
-                     {"3.3", "1"}},
-        DocumentCase{"NestedTwoLevelsDeep", "<R><P><S>" + Cfg(A("1")) + "</S></P></R>", {"A"}, {"1"}},
-        DocumentCase{"DirectChildBeforeDeeperOne",
-                     "<R><D>" + Cfg(A("deep")) + "</D>" + Cfg(A("direct")) + "</R>",
-                     {"A"},
-                     {"direct"}},
-        DocumentCase{"FirstSubtreeDepthFirst",
-                     "<R><P><Q>" + Cfg(A("first")) + "</Q></P><S>" + Cfg(A("second")) + "</S></R>",
-                     {"A"},
-                     {"first"}},
-        DocumentCase{"OnlyTheFirstConfigurationCounts",
-                     "<R>" + Cfg(A("1")) + Cfg("<E k=\"B\" v=\"2\"/>") + "</R>",
-                     {"A", "B"},
-                     {"1", "-"}},
-        DocumentCase{"NameIsCaseSensitive",
-                     "<R><wyxconfiguration>" + A("1") + "</wyxconfiguration></R>",
-                     {"A"},
-                     {"-"}},
-        DocumentCase{"TheRootItselfIsNotSearched", Cfg(A("1")), {"A"}, {"-"}},
-        DocumentCase{"AttributeCounts",
-                     InConfiguration("<One k=\"A\"/><Three k=\"B\" v=\"2\" extra=\"x\"/><None/>text<Two "
-                                     "x=\"C\" y=\"3\"><Child k=\"D\" v=\"4\"/></Two>"),
-                     {"A", "B", "extra", "C", "D"},
-                     {"-", "2", "-", "3", "-"}},
-        DocumentCase{"DuplicateKeyFirstWins", InConfiguration(A("first") + A("second")), {"A"}, {"first"}},
-        DocumentCase{"KeysAreCaseSensitive",
-                     InConfiguration("<E k=\"Key\" v=\"1\"/>"),
-                     {"Key", "key", "Key "},
-                     {"1", "-", "-"}},
-        DocumentCase{"NonAsciiValues",
-                     "<?xml version=\"1.0\" encoding=\"UTF-8\"?>" +
-                         InConfiguration(A("Caf\xC3\xA9 &amp; \xE2\x82\xAC")),
-                     {"A"},
-                     {"Caf\xC3\xA9 & \xE2\x82\xAC"}},
-        DocumentCase{"BrokenXmlAddsNothing", "<R>" + Cfg(A("1")), {"A"}, {"-"}},
-        DocumentCase{"UnparsableBytes", "\xFF\xFE not xml at all", {"APP_WYX_VERSION"}, {"-"}},
-        DocumentCase{"EmptyFile", "", {"A"}, {"-"}}),
-    [](const auto& info) { return std::string(info.param.name); });
+TEST_F(JournalTest, AConfigurationGivesTheEntriesOfTheFirstConfigurationFound)
+{
+    // A document; keys; each key's value, or "-" where the store does not know it.
+    for (const auto& [document, keys, values] : std::vector<std::tuple<std::string, Lines, Lines>>{
+             {"<?xml version=\"1.0\" encoding=\"UTF-8\"?>" +
+                  InConfiguration("<Entry key=\"APP_WYX_VERSION\" value=\"3.3\"/><Entry "
+                                  "key=\"ICON_SHELL_NOTIFY\" value=\"1\"/>"),
+              {"APP_WYX_VERSION", "ICON_SHELL_NOTIFY"},
+              {"3.3", "1"}},
+             {"<R><P><S>" + Cfg(A("1")) + "</S></P></R>", {"A"}, {"1"}},
+             {"<R><D>" + Cfg(A("deep")) + "</D>" + Cfg(A("direct")) + "</R>", {"A"}, {"direct"}},
+             {"<R><P><Q>" + Cfg(A("first")) + "</Q></P><S>" + Cfg(A("second")) + "</S></R>",
+              {"A"},
+              {"first"}},
+             {"<R>" + Cfg(A("1")) + Cfg("<E k=\"B\" v=\"2\"/>") + "</R>", {"A", "B"}, {"1", "-"}},
+             {"<R><wyxconfiguration>" + A("1") + "</wyxconfiguration></R>", {"A"}, {"-"}},
+             {Cfg(A("1")), {"A"}, {"-"}},
+             {InConfiguration("<One k=\"A\"/><Three k=\"B\" v=\"2\" extra=\"x\"/><None/>text<Two "
+                              "x=\"C\" y=\"3\"><Child k=\"D\" v=\"4\"/></Two>"),
+              {"A", "B", "extra", "C", "D"},
+              {"-", "2", "-", "3", "-"}},
+             {InConfiguration(A("first") + A("second") + "<E k=\"Key\" v=\"1\"/>"),
+              {"A", "Key", "key", "Key "},
+              {"first", "1", "-", "-"}},
+             {"<?xml version=\"1.0\" encoding=\"UTF-8\"?>" +
+                  InConfiguration(A("Caf\xC3\xA9 &amp; \xE2\x82\xAC")),
+              {"A"},
+              {"Caf\xC3\xA9 & \xE2\x82\xAC"}},
+             {"<R>" + Cfg(A("1")), {"A"}, {"-"}},
+             {"\xFF\xFE not xml at all", {"APP_WYX_VERSION"}, {"-"}},
+             {"", {"A"}, {"-"}}})
+    {
+        SCOPED_TRACE(document);
+        WriteBytes(Root() + "/WyxConfig.cfg", document);
+        ConfigStore store, fromMemory;
+        EXPECT_TRUE(store.LoadFile(wxString::FromUTF8(Root() + "/WyxConfig.cfg")));
+        EXPECT_EQ(Values(store, keys), values);
+        fromMemory.LoadDocument(document.data(), document.size());
+        EXPECT_EQ(Values(fromMemory, keys), values);
+    }
+}
 
 TEST_F(JournalTest, AConfigValueOnceLoadedSurvivesAChangeOfTheFileAndAMissingFileChangesNothing)
 {
     const std::string file = Root() + "/WyxConfig.cfg";
     ConfigStore store;
     wxString notify = "0";
-    EXPECT_FALSE(store.LoadFile(FromUtf8(file)));
+    EXPECT_FALSE(store.LoadFile(wxString::FromUTF8(file)));
     EXPECT_FALSE(store.LoadFile(wxString()));
     EXPECT_FALSE(store.Lookup("ICON_SHELL_NOTIFY", notify));
     EXPECT_EQ(notify, "0");
     WriteBytes(file, InConfiguration("<Entry key=\"ICON_SHELL_NOTIFY\" value=\"0\"/>"));
-    ASSERT_TRUE(store.LoadFile(FromUtf8(file)));
+    ASSERT_TRUE(store.LoadFile(wxString::FromUTF8(file)));
     WriteBytes(file,
                InConfiguration(
                    "<E key=\"ICON_SHELL_NOTIFY\" value=\"1\"/><E key=\"APP_WYX_VERSION\" value=\"4.0\"/>"));
-    ASSERT_TRUE(store.LoadFile(FromUtf8(file)));
+    ASSERT_TRUE(store.LoadFile(wxString::FromUTF8(file)));
     // The changed value keeps the old one; a key added later comes in.
     EXPECT_EQ(Values(store, {"ICON_SHELL_NOTIFY", "APP_WYX_VERSION"}), (Lines{"0", "4.0"}));
 
     // The program's version comes from the process-wide store.
     EXPECT_EQ(GetApplicationVersion(false), "");
-    ASSERT_TRUE(ConfigStore::Instance().LoadFile(FromUtf8(file)));
+    ASSERT_TRUE(ConfigStore::Instance().LoadFile(wxString::FromUTF8(file)));
     EXPECT_EQ(GetApplicationVersion(false), "4.0");
 }
 
-TEST(ConfigStoreThreads, LookupsBesideALoadSeeNoHalfWrittenEntries)
-{
-    // Run under ThreadSanitizer: a race on the entries fails the test there.
-    ConfigStore store;
-    const std::string document =
-        InConfiguration("<E key=\"APP_WYX_VERSION\" value=\"3.3\"/><E key=\"N\" value=\"1\"/>");
-    std::thread loader([&] { store.LoadDocument(document.data(), document.size()); });
-    for (int i = 0; i < 1000; ++i)
-    {
-        wxString value;
-        if (store.Lookup("APP_WYX_VERSION", value))
-            EXPECT_EQ(value, "3.3");
-    }
-    loader.join();
-    EXPECT_EQ(Values(store, {"N"}), Lines{"1"});
-}
-
-TEST(ConfigFile, LiesBesideTheExecutable)
+// Beside the executable in the build; in ../share/wyxprogress next to its folder once installed.
+TEST(ConfigFile, LiesBesideTheExecutableOrInTheInstalledDefaults)
 {
     wxAppConsole app; // the standard paths belong to an application
+    const fs::path executable = fs::read_symlink("/proc/self/exe").parent_path();
     const wxFileName path(GetConfigFilePath());
     EXPECT_EQ(path.GetFullName(), "WyxConfig.cfg");
-    EXPECT_EQ(path.GetPath(),
-              JournalTest::FromUtf8(fs::read_symlink("/proc/self/exe").parent_path().string()));
+    EXPECT_EQ(path.GetPath(), wxString::FromUTF8(executable.string()));
+
+    const std::string name = "installed-" + std::to_string(::getpid());
+    const fs::path share = executable.parent_path() / "share", installed = share / "wyxprogress" / name;
+    EXPECT_EQ(FindProgramFile(name), wxString::FromUTF8((executable / name).string())) << "neither exists";
+    fs::create_directories(installed.parent_path());
+    JournalTest::WriteBytes(installed.string(), "");
+    EXPECT_EQ(FindProgramFile(name), wxString::FromUTF8(installed.string()));
+    fs::remove(installed);
+    std::error_code kept; // left alone when anyone else uses it
+    fs::remove(installed.parent_path(), kept);
+    fs::remove(share, kept);
 }
 
 TEST(DataDirectory, LiesBelowTheSystemRoot)

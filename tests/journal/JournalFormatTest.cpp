@@ -15,14 +15,7 @@ namespace journaltest
 namespace
 {
 
-template <typename Case> std::string CaseName(const ::testing::TestParamInfo<Case>& info)
-{
-    return info.param.name;
-}
-
 using JournalFormat = JournalTest;
-
-// --- what each operation of the command leaves, byte for byte -----------------
 
 // UTF-8 lines around two that are not (a Latin-1 line from an old producer and
 // a stray byte), with CR LF and LF ends: an edit keeps every line it is not about.
@@ -30,73 +23,44 @@ const std::string kZurich = "1\tZ\xC3\xBCrich\tADDED\r\n", kMunich = "2\tM\xFCnc
 const std::string kTokyo = "3\t\xE6\x9D\xB1\xE4\xBA\xAC\tADDED\n", kStray = "4\tx\xFF\tMODIFIED\r\n";
 const std::string kMixed = kZurich + kMunich + kTokyo + kStray;
 
-struct EditCase
+TEST_F(JournalFormat, AnEditLeavesEveryOtherLineByteForByte)
 {
-    const char* name;
-    std::string before;
-    Arguments arguments; // after the journal's name
-    std::string after;
-};
-
-class JournalEdit : public JournalTest, public ::testing::WithParamInterface<EditCase>
-{
-};
-
-TEST_P(JournalEdit, LeavesEveryOtherLineByteForByte)
-{
-    WriteBytes(StatusJournal(), GetParam().before);
-    Arguments arguments{"status"};
-    arguments.insert(arguments.end(), GetParam().arguments.begin(), GetParam().arguments.end());
-    ASSERT_EQ(RunTool(arguments).status, 0);
-    EXPECT_EQ(ReadBytes(StatusJournal()), GetParam().after);
-    EXPECT_TRUE(fs::is_regular_file(StatusJournal())) << "an empty journal is still a journal";
+    // The journal before, the command's arguments after the journal's name, the journal after.
+    for (const auto& [before, arguments, after] :
+         std::vector<std::tuple<std::string, Arguments, std::string>>{
+             {kMixed, {"add", "5\tK\xC3\xB6ln"}, kMixed + "5\tK\xC3\xB6ln\tADDED\r\n"},
+             {kMixed, {"modify", "3\tKyoto"}, kZurich + kMunich + "3\tKyoto\tMODIFIED\n" + kStray},
+             {kMixed, {"modify", "2\tM\xC3\xBC"}, kZurich + "2\tM\xC3\xBC\tMODIFIED\r\n" + kTokyo + kStray},
+             {kMixed + kZurich, {"delete", "1"}, kMunich + kTokyo + kStray},
+             {kMixed + kTokyo, {"remove", "3"}, kZurich + kMunich + kStray},
+             {kMixed, {"commit", "1"}, "1\tZ\xC3\xBCrich\tCOMMIT\r\n" + kMunich + kTokyo + kStray},
+             {kMixed, {"commit", "9"}, kMixed},
+             {kMixed, {"clear"}, ""},
+             {"4\ta\tADDED\r\n4\tDELETE\r\n", {"commit", "4"}, "4\ta\tCOMMIT\r\n4\tDELETE\r\n"},
+             {"7\r\n", {"commit", "7"}, "7\tCOMMIT\r\n"},
+             {"1\ta\r\n", {"modify", "9\tz"}, "1\ta\r\n"},
+             // Every kind of line end, a LF before a CR and a CR before a CR LF among them.
+             {"1\ta\r\n2\n\r3\r\r\n4", {"add", "5\te"}, "1\ta\r\n2\n\r3\r\r\n4\r\n5\te\tADDED\r\n"},
+             {"1\ta\n2\tb\r\n3\tc", {"delete", "2"}, "1\ta\n3\tc"},
+             {"1\ta", {"add", ""}, "1\ta"},
+             // Kept as they came, the first bytes would make the rewrite a UTF-16 file.
+             {"1\r\n\xFF\xFE\tb\r\n3\t\xFF\r\n", {"delete", "1"}, "\xC3\xBF\xC3\xBE\tb\r\n3\t\xFF\r\n"}})
+    {
+        SCOPED_TRACE(::testing::PrintToString(arguments) + " on " + ::testing::PrintToString(before));
+        WriteBytes(StatusJournal(), before);
+        Arguments command{"status"};
+        command.insert(command.end(), arguments.begin(), arguments.end());
+        ASSERT_EQ(RunTool(command), 0);
+        EXPECT_EQ(ReadBytes(StatusJournal()), after);
+        EXPECT_TRUE(fs::is_regular_file(StatusJournal())) << "an empty journal is still a journal";
+    }
 }
-
-INSTANTIATE_TEST_SUITE_P(
-    Operations, JournalEdit,
-    ::testing::Values(
-        EditCase{"Add", kMixed, {"add", "5\tK\xC3\xB6ln"}, kMixed + "5\tK\xC3\xB6ln\tADDED\r\n"},
-        EditCase{"ModifyAUtf8Line",
-                 kMixed,
-                 {"modify", "3\tKyoto"},
-                 kZurich + kMunich + "3\tKyoto\tMODIFIED\n" + kStray},
-        EditCase{"ModifyTheLatin1Line",
-                 kMixed,
-                 {"modify", "2\tM\xC3\xBC"},
-                 kZurich + "2\tM\xC3\xBC\tMODIFIED\r\n" + kTokyo + kStray},
-        EditCase{"DeleteEveryLineOfTheKey", kMixed + kZurich, {"delete", "1"}, kMunich + kTokyo + kStray},
-        EditCase{"DeleteTheStrayByte", kMixed, {"delete", "4"}, kZurich + kMunich + kTokyo},
-        EditCase{"RemoveEveryLineOfTheKey", kMixed + kTokyo, {"remove", "3"}, kZurich + kMunich + kStray},
-        EditCase{
-            "Commit", kMixed, {"commit", "1"}, "1\tZ\xC3\xBCrich\tCOMMIT\r\n" + kMunich + kTokyo + kStray},
-        EditCase{"CommitOfNoLine", kMixed, {"commit", "9"}, kMixed}, EditCase{"Clear", kMixed, {"clear"}, ""},
-        EditCase{"CommitSkipsDelete",
-                 "4\ta\tADDED\r\n4\tDELETE\r\n",
-                 {"commit", "4"},
-                 "4\ta\tCOMMIT\r\n4\tDELETE\r\n"},
-        EditCase{"CommitOfALineOfOneField", "7\r\n", {"commit", "7"}, "7\tCOMMIT\r\n"},
-        EditCase{"ModifyOfAnUnknownKey", "1\ta\r\n", {"modify", "9\tz"}, "1\ta\r\n"},
-        EditCase{
-            "AddEndsTheLastLine", "1\ta\r\n2\n3\r4", {"add", "5\te"}, "1\ta\r\n2\n3\r4\r\n5\te\tADDED\r\n"},
-        EditCase{"RewriteKeepsNoFinalLineBreak", "1\ta\n2\tb\r\n3\tc", {"delete", "2"}, "1\ta\n3\tc"},
-        EditCase{"AddOfAnEmptyLine", "1\ta", {"add", ""}, "1\ta"},
-        // Kept as they came, the first bytes would make the rewrite a UTF-16 file.
-        EditCase{"NoUtf16MarkAtTheStart",
-                 "1\r\n\xFF\xFE\tb\r\n3\t\xFF\r\n",
-                 {"delete", "1"},
-                 "\xC3\xBF\xC3\xBE\tb\r\n3\t\xFF\r\n"}),
-    CaseName<EditCase>);
 
 TEST_F(JournalFormat, KeysMatchForDeleteCommitAndModifyWhenEqualButForTrailingBlanks)
 {
-    for (const auto& [storedKey, given, m] : {std::tuple<std::string, std::string, bool>{"42", "42", true},
-                                              {"42", "42 ", true},
-                                              {"42   ", "42", true},
+    for (const auto& [storedKey, given, m] : {std::tuple<std::string, std::string, bool>{"42", "42 ", true},
                                               {"42", "042", false},
-                                              {"042", "42", false},
-                                              {"JobA", "joba", false},
                                               {"42", "4", false},
-                                              {"4", "42", false},
                                               {" 42", "42", false}})
     {
         const std::string stored = storedKey + "\ta\tADDED", other = "x\tb\tADDED", modified = given + "\tz";
@@ -108,7 +72,7 @@ TEST_F(JournalFormat, KeysMatchForDeleteCommitAndModifyWhenEqualButForTrailingBl
         {
             SCOPED_TRACE(std::string(operation) + " '" + given + "' of '" + storedKey + "'");
             WriteBytes(StatusJournal(), stored + "\r\n" + other + "\r\n");
-            ASSERT_EQ(RunTool({"status", operation, argument}).status, 0);
+            ASSERT_EQ(RunTool({"status", operation, argument}), 0);
             EXPECT_EQ(ReadLines(StatusJournal()), expected);
         }
     }
@@ -120,7 +84,6 @@ TEST_F(JournalFormat, AppendTrimsOnlyAFullLogJournal)
     for (const auto& [journal, before, after, firstKept] :
          {std::tuple<std::string, std::size_t, std::size_t, std::size_t>{"log", 10000, 7001, 3001},
           {"log", 9999, 10000, 1},
-          {"log", 12000, 9001, 3001},
           {"status", 10000, 10001, 1}})
     {
         SCOPED_TRACE(journal + " " + std::to_string(before));
@@ -129,7 +92,7 @@ TEST_F(JournalFormat, AppendTrimsOnlyAFullLogJournal)
         for (std::size_t i = 1; i <= before; ++i)
             text += std::to_string(i) + "\tjob.pdf\tADDED\r\n";
         WriteBytes(path, text);
-        ASSERT_EQ(RunTool({journal, "add", "new\tn.pdf"}).status, 0);
+        ASSERT_EQ(RunTool({journal, "add", "new\tn.pdf"}), 0);
         const Lines lines = ReadLines(path);
         ASSERT_EQ(lines.size(), after);
         EXPECT_EQ(lines.front(), std::to_string(firstKept) + "\tjob.pdf\tADDED");
@@ -138,11 +101,9 @@ TEST_F(JournalFormat, AppendTrimsOnlyAFullLogJournal)
     }
 }
 
-// --- the command's own rules ----------------------------------------------------------
-
-TEST_F(JournalFormat, WrongUsageIsRefusedWithStatus2AndChangesNothing)
+TEST_F(JournalFormat, TheCommandRefusesWrongUsageWithStatus2AndReadPrintsTheLines)
 {
-    WriteBytes(StatusJournal(), "1\ta\tADDED\r\n");
+    WriteBytes(StatusJournal(), "1\ta\tADDED\r\n\r\n2\tb\tADDED\n\n3\tc");
     for (const Arguments& arguments : {Arguments{},
                                        {"status"},
                                        {"journal", "read"},
@@ -155,39 +116,16 @@ TEST_F(JournalFormat, WrongUsageIsRefusedWithStatus2AndChangesNothing)
                                        {"status", "delete", ""},
                                        {"status", "add", "1\t\xff"},
                                        {"status", "clear", "now"}})
-    {
-        SCOPED_TRACE(::testing::PrintToString(arguments));
-        const ToolRun run = RunTool(arguments);
-        EXPECT_EQ(run.status, 2);
-        EXPECT_EQ(run.out, "");
-    }
-    EXPECT_EQ(ReadBytes(StatusJournal()), "1\ta\tADDED\r\n");
-}
-
-TEST_F(JournalFormat, ReadPrintsTheLinesAsStoredAndReportsOutputItCannotWrite)
-{
-    WriteBytes(StatusJournal(), "1\ta\tADDED\r\n\r\n2\tb\tADDED\n\n3\tc");
-    const ToolRun run = RunTool({"status", "read"});
-    EXPECT_EQ(run.status, 0);
-    EXPECT_EQ(run.out, "1\ta\tADDED\n\n2\tb\tADDED\n\n3\tc\n");
+        EXPECT_EQ(Run("exec " + Quoted(WYX_JOURNAL_TOOL), arguments), std::make_pair(2, std::string()))
+            << ::testing::PrintToString(arguments);
+    EXPECT_EQ(Run("exec " + Quoted(WYX_JOURNAL_TOOL), {"status", "read"}),
+              std::make_pair(0, std::string("1\ta\tADDED\n\n2\tb\tADDED\n\n3\tc\n")));
     EXPECT_EQ(ReadLines(StatusJournal()), (Lines{"1\ta\tADDED", "", "2\tb\tADDED", "", "3\tc"}));
-    // A journal may also be named by its path.
+    // A journal may also be named by its path; output it cannot write is an error.
     WriteBytes(Root() + "/elsewhere.txt", "2\tb\r\n");
-    EXPECT_EQ(RunTool({Root() + "/elsewhere.txt", "read"}).out, "2\tb\n");
+    EXPECT_EQ(Run("exec " + Quoted(WYX_JOURNAL_TOOL), {Root() + "/elsewhere.txt", "read"}).second, "2\tb\n");
     for (const Arguments& arguments : {Arguments{"status", "read"}, Arguments{"--help"}})
-        EXPECT_EQ(RunTool(arguments, "exec > /dev/full;").status, 4) << arguments.front();
-}
-
-TEST_F(JournalFormat, AddTagsTheCallersLineAndAnEmptyKeyMatchesNothing)
-{
-    WriteBytes(StatusJournal(), "\r\n\tx\tADDED\r\n");
-    wyx::JobsFileReadWriter journal = Journal(StatusJournal());
-    EXPECT_EQ(journal.DeleteJob(""), wyx::JobOk);
-    EXPECT_EQ(journal.CommitJob("  "), wyx::JobOk);
-    wxString line = "5\ta.pdf";
-    ASSERT_EQ(journal.AddJob(line), wyx::JobOk);
-    EXPECT_EQ(Utf8(line), "5\ta.pdf\tADDED");
-    EXPECT_EQ(ReadBytes(StatusJournal()), "\r\n\tx\tADDED\r\n5\ta.pdf\tADDED\r\n");
+        EXPECT_EQ(RunTool(arguments, "exec > /dev/full;"), 4) << arguments.front();
 }
 
 using Operation = int (*)(wyx::IJobReadWriter&);
@@ -201,33 +139,38 @@ const std::vector<std::pair<const char*, Operation>> kOperations = {
     {"CommitJob", [](wyx::IJobReadWriter& j) { return j.CommitJob("1"); }},
 };
 
-TEST_F(JournalFormat, NoOperationCreatesAJournalAndWithoutPathNothingIsDone)
+TEST_F(JournalFormat, NoOperationCreatesAJournalAndAnEmptyKeyMatchesNothing)
 {
-    for (int kind : {0, 1, 4000, 4002, -4001})
-        EXPECT_EQ(std::unique_ptr<wyx::IJobReadWriter>(CreateJobReadWriter(kind)), nullptr) << kind;
+    EXPECT_EQ(std::unique_ptr<wyx::IJobReadWriter>(CreateJobReadWriter(kJobsFileReadWriterKind + 1)),
+              nullptr);
     std::unique_ptr<wyx::IJobReadWriter> pathless(CreateJobReadWriter(kJobsFileReadWriterKind));
     ASSERT_NE(pathless, nullptr);
     EXPECT_EQ(static_cast<wyx::JobsFileReadWriter&>(*pathless).GetPath(), wxString());
     for (const auto& [name, operation] : kOperations)
         EXPECT_EQ(operation(*pathless), wyx::JobOk) << name;
     EXPECT_FALSE(fs::exists(Root() + "/dev/shm"));
+    for (bool folder : {false, true})
+    {
+        for (const auto& [name, operation] : kOperations)
+        {
+            wyx::JobsFileReadWriter journal = Journal(StatusJournal());
+            EXPECT_EQ(operation(journal), wyx::JobFileMissing) << name << (folder ? " on a folder" : "");
+        }
+        EXPECT_EQ(RunTool({"status", "add", "1\ta"}), wyx::JobFileMissing);
+        EXPECT_EQ(FolderEntries(DataDirectory()), folder ? Lines{"TiveraJobsStatusFile.txt"} : Lines{});
+        fs::create_directory(StatusJournal());
+    }
 
-    for (const auto& [name, operation] : kOperations)
-    {
-        wyx::JobsFileReadWriter journal = Journal(StatusJournal());
-        EXPECT_EQ(operation(journal), wyx::JobFileMissing) << name;
-    }
-    EXPECT_EQ(RunTool({"status", "add", "1\ta"}).status, wyx::JobFileMissing);
-    EXPECT_EQ(FolderEntries(DataDirectory()), Lines{});
-    ASSERT_TRUE(fs::create_directory(StatusJournal()));
-    for (const auto& [name, operation] : kOperations)
-    {
-        wyx::JobsFileReadWriter journal = Journal(StatusJournal());
-        EXPECT_EQ(operation(journal), wyx::JobFileMissing) << "folder: " << name;
-    }
+    fs::remove(StatusJournal());
+    WriteBytes(StatusJournal(), "\r\n\tx\tADDED\r\n");
+    wyx::JobsFileReadWriter journal = Journal(StatusJournal());
+    EXPECT_EQ(journal.DeleteJob(""), wyx::JobOk);
+    EXPECT_EQ(journal.CommitJob("  "), wyx::JobOk);
+    wxString line = "5\ta.pdf";
+    ASSERT_EQ(journal.AddJob(line), wyx::JobOk);
+    EXPECT_EQ(Utf8(line), "5\ta.pdf\tADDED") << "the caller's line is tagged";
+    EXPECT_EQ(ReadBytes(StatusJournal()), "\r\n\tx\tADDED\r\n5\ta.pdf\tADDED\r\n");
 }
-
-// --- encodings ---------------------------------------------------------------------------
 
 TEST_F(JournalFormat, AJournalWithAMarkIsDecodedAndRewrittenAsUtf8WithoutMark)
 {
@@ -245,45 +188,9 @@ TEST_F(JournalFormat, AJournalWithAMarkIsDecodedAndRewrittenAsUtf8WithoutMark)
         SCOPED_TRACE(::testing::PrintToString(bytes));
         WriteBytes(StatusJournal(), bytes);
         EXPECT_EQ(ReadLines(StatusJournal()), (Lines{first, "2\tb"}));
-        ASSERT_EQ(RunTool({"status", "add", "3\tc"}).status, 0);
+        ASSERT_EQ(RunTool({"status", "add", "3\tc"}), 0);
         EXPECT_EQ(ReadBytes(StatusJournal()), first + "\r\n2\tb\n3\tc\tADDED\r\n");
     }
-}
-
-struct BytesCase
-{
-    std::string bytes;
-    std::string lines; // as ReadJobs gives them, in UTF-8, each followed by '|'
-    bool rewritable;   // whether a writing operation may replace the file
-};
-
-class JournalBytes : public JournalTest, public ::testing::WithParamInterface<BytesCase>
-{
-};
-
-TEST_P(JournalBytes, AreReadWithoutHarmAndNeverRewrittenWhenUndecodable)
-{
-    const BytesCase& c = GetParam();
-    WriteBytes(StatusJournal(), c.bytes);
-    auto joined = [this]
-    {
-        std::string lines;
-        for (const std::string& line : ReadLines(StatusJournal()))
-            lines += line + "|";
-        return lines;
-    };
-    EXPECT_EQ(joined(), c.lines);
-    // A rewrite is exact UTF-8 without a mark; what could not be decoded is never written back.
-    EXPECT_EQ(Journal(StatusJournal()).DeleteJob("no such key"),
-              c.rewritable ? wyx::JobOk : wyx::JobFileMissing);
-    EXPECT_EQ(joined(), c.lines);
-    const std::string after = ReadBytes(StatusJournal());
-    if (c.rewritable)
-        EXPECT_TRUE(wyx::DecodeJournal(after.data(), after.size()).exact) << after;
-    else
-        EXPECT_EQ(after, c.bytes);
-    EXPECT_EQ(Journal(StatusJournal()).ClearJobs(), wyx::JobOk);
-    EXPECT_EQ(ReadBytes(StatusJournal()), "");
 }
 
 std::string Bytes(std::initializer_list<unsigned char> values)
@@ -291,65 +198,64 @@ std::string Bytes(std::initializer_list<unsigned char> values)
     return std::string(values.begin(), values.end());
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    Inputs, JournalBytes,
-    ::testing::Values(
-        // Each line in its own encoding: UTF-8 where valid, else single bytes.
-        BytesCase{kMixed,
-                  "1\tZ\xC3\xBCrich\tADDED|2\tM\xC3\xBCnchen\tADDED|3\t\xE6\x9D\xB1\xE4\xBA\xAC\tADDED|"
-                  "4\tx\xC3\xBF\tMODIFIED|",
-                  true},
-        BytesCase{"1\tab\xE2\x82", "1\tab\xC3\xA2\xC2\x82|", true},
-        // An overlong "/", an encoded surrogate and a value beyond U+10FFFF are no UTF-8.
-        BytesCase{"1\t\xC0\xAF\r\n", "1\t\xC3\x80\xC2\xAF|", true},
-        BytesCase{"\xED\xA0\x80", "\xC3\xAD\xC2\xA0\xC2\x80|", true},
-        BytesCase{"\xF4\x90\x80\x80", "\xC3\xB4\xC2\x90\xC2\x80\xC2\x80|", true},
-        // Runs of ASCII are taken eight bytes at a time; what follows must still decode.
-        BytesCase{"0123456789abcdef\xF0\x9F\x96\xA8\tK\xC3\xB6ln 012345678\xE2\x82\xAC\r\nx",
-                  "0123456789abcdef\xF0\x9F\x96\xA8\tK\xC3\xB6ln 012345678\xE2\x82\xAC|x|", true},
-        BytesCase{"\xFF", "\xC3\xBF|", true}, BytesCase{"\xEF\xBB", "\xC3\xAF\xC2\xBB|", true},
-        BytesCase{"\xEF\xBB\xBF", "", true}, BytesCase{"", "", true},
-        // A mark written twice must not survive as a mark of the rewrite.
-        BytesCase{Bytes({0xFF, 0xFE, 0xFF, 0xFE, '1', 0, '\t', 0, 'a', 0}), "1\ta|", true},
-        BytesCase{"\xEF\xBB\xBF\xEF\xBB\xBF"
-                  "1\ta",
-                  "1\ta|", true},
-        BytesCase{std::string("1\ta\0b\r\n", 7), std::string("1\ta\0b|", 6), true},
-        BytesCase{Bytes({0xFF, 0xFE, '1', 0, '\t', 0, 'a', 0, '\n', 0, 'b'}), "1\ta|\xEF\xBF\xBD|", false},
-        BytesCase{Bytes({0xFE, 0xFF, 0, '1', 0xD8, 0x01, 0, 'x', 0, '\n'}), "1\xEF\xBF\xBDx|", false},
-        BytesCase{Bytes({0xFF, 0xFE, 0, 0, 'a', 0, 0, 0, 0, 0, 0x11, 0, '\n', 0, 0, 0}), "a\xEF\xBF\xBD|",
-                  false},
-        BytesCase{Bytes({0, 0, 0xFE, 0xFF, 0, 0, 0, 'a', 0, 0}), "a\xEF\xBF\xBD|", false},
-        // Kept as they came, these bytes would begin the rewrite with a UTF-16 mark.
-        BytesCase{"\xEF\xBB\xBF\xFF\xFE\t1\r\n", "\xC3\xBF\xC3\xBE\t1|", true},
-        BytesCase{"\xEF\xBB\xBF"
-                  "1\t\xFF\r\n",
-                  "1\t\xC3\xBF|", true}));
-
-TEST(JournalLineEnds, SplitAtCrLfLfOrCrAndComeBackUnchanged)
+TEST_F(JournalFormat, BytesAreReadWithoutHarmAndNeverRewrittenWhenUndecodable)
 {
-    // Lines each followed by '|'; ends N: none, C: CR LF, L: LF, R: CR.
-    for (const auto& [text, expectedLines, expectedEnds] :
-         {std::tuple<std::string, std::string, std::string>{"", "", ""},
-          {"a", "a|", "N"},
-          {"a\r\n", "a|", "C"},
-          {"\n", "|", "L"},
-          {"a\n\rb", "a||b|", "LRN"},
-          {"a\r\r\n", "a||", "RC"},
-          {"a\rb\nc\r\nd", "a|b|c|d|", "RLCN"},
-          {"\r\n\r\n", "||", "CC"},
-          {"a\rb\rc\r\nd\re", "a|b|c|d|e|", "RRCRN"}})
+    // The bytes; the lines as ReadJobs gives them, in UTF-8, each followed by '|'; whether a writing
+    // operation may replace the file.
+    for (const auto& [bytes, expected, rewritable] : std::vector<std::tuple<std::string, std::string, bool>>{
+             // Each line in its own encoding: UTF-8 where valid, else single bytes.
+             {kMixed,
+              "1\tZ\xC3\xBCrich\tADDED|2\tM\xC3\xBCnchen\tADDED|3\t\xE6\x9D\xB1\xE4\xBA\xAC\tADDED|"
+              "4\tx\xC3\xBF\tMODIFIED|",
+              true},
+             {"1\tab\xE2\x82", "1\tab\xC3\xA2\xC2\x82|", true},
+             // An overlong "/", an encoded surrogate and a value beyond U+10FFFF are no UTF-8.
+             {"1\t\xC0\xAF\r\n", "1\t\xC3\x80\xC2\xAF|", true},
+             {"\xED\xA0\x80", "\xC3\xAD\xC2\xA0\xC2\x80|", true},
+             {"\xF4\x90\x80\x80", "\xC3\xB4\xC2\x90\xC2\x80\xC2\x80|", true},
+             // Runs of ASCII are taken eight bytes at a time; what follows must still decode.
+             {"0123456789abcdef\xF0\x9F\x96\xA8\tK\xC3\xB6ln 012345678\xE2\x82\xAC\r\nx",
+              "0123456789abcdef\xF0\x9F\x96\xA8\tK\xC3\xB6ln 012345678\xE2\x82\xAC|x|", true},
+             {"\xFF", "\xC3\xBF|", true},
+             {"\xEF\xBB", "\xC3\xAF\xC2\xBB|", true},
+             {"\xEF\xBB\xBF", "", true},
+             {"", "", true},
+             {"a\n\rb\r\r\nc\r", "a||b||c|", true},
+             // A mark written twice must not survive as a mark of the rewrite.
+             {Bytes({0xFF, 0xFE, 0xFF, 0xFE, '1', 0, '\t', 0, 'a', 0}), "1\ta|", true},
+             {"\xEF\xBB\xBF\xEF\xBB\xBF"
+              "1\ta",
+              "1\ta|", true},
+             {std::string("1\ta\0b\r\n", 7), std::string("1\ta\0b|", 6), true},
+             {Bytes({0xFF, 0xFE, '1', 0, '\t', 0, 'a', 0, '\n', 0, 'b'}), "1\ta|\xEF\xBF\xBD|", false},
+             {Bytes({0xFE, 0xFF, 0, '1', 0xD8, 0x01, 0, 'x', 0, '\n'}), "1\xEF\xBF\xBDx|", false},
+             {Bytes({0xFF, 0xFE, 0, 0, 'a', 0, 0, 0, 0, 0, 0x11, 0, '\n', 0, 0, 0}), "a\xEF\xBF\xBD|", false},
+             {Bytes({0, 0, 0xFE, 0xFF, 0, 0, 0, 'a', 0, 0}), "a\xEF\xBF\xBD|", false},
+             // Kept as they came, these bytes would begin the rewrite with a UTF-16 mark.
+             {"\xEF\xBB\xBF\xFF\xFE\t1\r\n", "\xC3\xBF\xC3\xBE\t1|", true},
+             {"\xEF\xBB\xBF"
+              "1\t\xFF\r\n",
+              "1\t\xC3\xBF|", true}})
     {
-        const wyx::DecodedJournal journal = wyx::DecodeJournal(text.data(), text.size());
-        std::string lines, ends;
-        for (const wyx::JournalLine& line : journal.lines)
+        SCOPED_TRACE(::testing::PrintToString(bytes));
+        WriteBytes(StatusJournal(), bytes);
+        const auto joined = [this]
         {
-            lines += JournalTest::Utf8(line.text) + "|";
-            ends += "NCLR"[static_cast<int>(line.end)];
-        }
-        EXPECT_EQ(lines, expectedLines) << text;
-        EXPECT_EQ(ends, expectedEnds) << text;
-        EXPECT_EQ(wyx::EncodeJournal(journal.lines), text);
+            std::string lines;
+            for (const std::string& line : ReadLines(StatusJournal()))
+                lines += line + "|";
+            return lines;
+        };
+        EXPECT_EQ(joined(), expected);
+        // A rewrite is exact UTF-8 without a mark; what could not be decoded is never written back.
+        EXPECT_EQ(Journal(StatusJournal()).DeleteJob("no such key"),
+                  rewritable ? wyx::JobOk : wyx::JobFileMissing);
+        EXPECT_EQ(joined(), expected);
+        const std::string after = ReadBytes(StatusJournal());
+        EXPECT_TRUE(rewritable ? wyx::DecodeJournal(after.data(), after.size()).exact : after == bytes)
+            << after;
+        EXPECT_EQ(Journal(StatusJournal()).ClearJobs(), wyx::JobOk);
+        EXPECT_EQ(ReadBytes(StatusJournal()), "");
     }
 }
 
@@ -359,67 +265,61 @@ constexpr off_t kBytes = static_cast<off_t>(wyx::kMaxJournalBytes);
 constexpr off_t kLine = static_cast<off_t>(wyx::kMaxJournalLineLength);
 constexpr off_t kLines = static_cast<off_t>(wyx::kMaxJournalLines);
 
-struct BoundCase
+TEST_F(JournalFormat, BoundsAreKeptByEveryRead)
 {
-    const char* name;
-    off_t size;
-    off_t spacing; // from one line feed to the next, the line feed included
-    bool readable;
-};
-
-class JournalBounds : public JournalTest, public ::testing::WithParamInterface<BoundCase>
-{
-};
-
-TEST_P(JournalBounds, AreKeptByEveryRead)
-{
-    // Sparse, with a line feed every `spacing` bytes: it costs the disk next to nothing.
-    const int fd = ::open(StatusJournal().c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, 0644);
-    bool written = fd >= 0 && ::ftruncate(fd, GetParam().size) == 0;
-    const std::string lineFeeds(GetParam().spacing == 1 ? GetParam().size : 0,
-                                '\n'); // one write, not a million
-    if (!lineFeeds.empty())
-        written = written && ::pwrite(fd, lineFeeds.data(), lineFeeds.size(), 0) == GetParam().size;
-    for (off_t at = GetParam().spacing - 1; written && lineFeeds.empty() && at < GetParam().size;
-         at += GetParam().spacing)
-        written = ::pwrite(fd, "\n", 1, at) == 1;
-    ::close(fd);
-    ASSERT_TRUE(written);
-
-    wyx::JobsFileReadWriter journal = Journal(StatusJournal());
-    wxArrayString lines;
-    lines.Add("held before");
-    if (GetParam().readable)
+    // The journal's size; from one line feed to the next, the line feed included; whether it may be read.
+    for (const auto& [size, spacing, readable] : std::vector<std::tuple<off_t, off_t, bool>>{
+             // Lines of half a mebibyte, so that only the journal's size counts.
+             {kBytes, kLine / 2, true},
+             {kBytes + 1, kLine / 2, false},
+             {2 * (kLine + 1), kLine + 1, true},
+             {2 * (kLine + 2), kLine + 2, false},
+             {kLines, 1, true},
+             {kLines + 1, 1, false}})
     {
-        EXPECT_EQ(journal.ReadJobs(lines), wyx::JobOk);
-        EXPECT_EQ(static_cast<off_t>(lines.size()), GetParam().size / GetParam().spacing);
-        return;
+        SCOPED_TRACE(std::to_string(size) + " bytes, a line feed every " + std::to_string(spacing));
+        // Sparse, with a line feed every `spacing` bytes: it costs the disk next to nothing.
+        const int fd = ::open(StatusJournal().c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644);
+        bool written = fd >= 0 && ::ftruncate(fd, size) == 0;
+        const std::string lineFeeds(spacing == 1 ? size : 0, '\n'); // one write, not a million
+        if (!lineFeeds.empty())
+            written = written && ::pwrite(fd, lineFeeds.data(), lineFeeds.size(), 0) == size;
+        for (off_t at = spacing - 1; written && lineFeeds.empty() && at < size; at += spacing)
+            written = ::pwrite(fd, "\n", 1, at) == 1;
+        ::close(fd);
+        ASSERT_TRUE(written);
+
+        wyx::JobsFileReadWriter journal = Journal(StatusJournal());
+        wxArrayString lines;
+        lines.Add("held before");
+        EXPECT_EQ(journal.ReadJobs(lines), readable ? wyx::JobOk : wyx::JobFileMissing);
+        EXPECT_EQ(static_cast<off_t>(lines.size()), readable ? size / spacing : 1);
+        if (readable)
+            continue;
+        EXPECT_EQ(Utf8Lines(lines), Lines{"held before"});
+        // An edit cannot read it either and leaves it as it is; a clear empties it.
+        wxString line = "1\ta";
+        EXPECT_EQ(journal.AddJob(line), wyx::JobFileMissing);
+        if (size > kBytes) // a line too many costs a second; every reader shares that check
+        {
+            EXPECT_EQ(journal.ReadJobsHoldingLock(lines), wyx::JobFileMissing);
+            EXPECT_EQ(journal.DeleteJob("1"), wyx::JobFileMissing);
+        }
+        EXPECT_EQ(static_cast<off_t>(fs::file_size(StatusJournal())), size);
+        EXPECT_EQ(journal.ClearJobs(), wyx::JobOk);
+        EXPECT_EQ(fs::file_size(StatusJournal()), 0u);
     }
-    EXPECT_EQ(journal.ReadJobs(lines), wyx::JobFileMissing);
-    EXPECT_EQ(Utf8Lines(lines), Lines{"held before"});
-    // An edit cannot read it either and leaves it as it is; a clear empties it.
-    wxString line = "1\ta";
-    EXPECT_EQ(journal.AddJob(line), wyx::JobFileMissing);
-    if (GetParam().size > kBytes) // a line too many costs a second; every reader shares that check
-    {
-        EXPECT_EQ(journal.ReadJobsHoldingLock(lines), wyx::JobFileMissing);
-        EXPECT_EQ(journal.DeleteJob("1"), wyx::JobFileMissing);
-    }
-    EXPECT_EQ(static_cast<off_t>(fs::file_size(StatusJournal())), GetParam().size);
-    EXPECT_EQ(journal.ClearJobs(), wyx::JobOk);
-    EXPECT_EQ(fs::file_size(StatusJournal()), 0u);
 }
 
-INSTANTIATE_TEST_SUITE_P(Journals, JournalBounds,
-                         ::testing::Values(
-                             // Lines of half a mebibyte, so that only the journal's size counts.
-                             BoundCase{"LargestJournal", kBytes, kLine / 2, true},
-                             BoundCase{"JournalOneByteTooLarge", kBytes + 1, kLine / 2, false},
-                             BoundCase{"LongestLine", 2 * (kLine + 1), kLine + 1, true},
-                             BoundCase{"LineOneByteTooLong", 2 * (kLine + 2), kLine + 2, false},
-                             BoundCase{"MostLines", kLines, 1, true},
-                             BoundCase{"OneLineTooMany", kLines + 1, 1, false}),
-                         CaseName<BoundCase>);
+// A read makes room for as many lines as the journal has, never for the most a journal may hold.
+TEST(JournalText, ReservesRoomForTheLinesItFinds)
+{
+    for (const std::string& text : {std::string("1\ta"), std::string("1\ta\n2\tb\r\n"),
+                                    std::string("\xFF\xFE"
+                                                "1\0",
+                                                4)})
+        EXPECT_LE(wyx::DecodeJournal(text.data(), text.size()).lines.capacity(), 3u) << text;
+}
 
 } // namespace
 } // namespace journaltest

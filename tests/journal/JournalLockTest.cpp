@@ -28,14 +28,22 @@ using JournalLock = JournalTest;
 
 TEST_F(JournalLock, TwoLocksOfOneNameExcludeEachOtherUntilOneIsReleasedOrGone)
 {
+    const mode_t previous = ::umask(077);
     named_mutex_lock first(kStatus), other(kLog);
+    ::umask(previous);
     ASSERT_TRUE(first.lock());
+    // The lock file and its folder are made for every user.
+    EXPECT_EQ(fs::status(LockFile(kStatus)).permissions(), static_cast<fs::perms>(0666));
+    EXPECT_EQ(fs::status(Root() + "/dev/shm").permissions(), static_cast<fs::perms>(01777));
     EXPECT_TRUE(other.try_lock()); // another name is another lock
     {
         named_mutex_lock second(kStatus);
         EXPECT_FALSE(second.try_lock());
         first.unlock();
         EXPECT_TRUE(second.try_lock());
+        // Unlocked, the first holds nothing: it cannot take the lock back while the second has it.
+        EXPECT_FALSE(first.try_lock());
+        EXPECT_FALSE(first.lock(std::make_unique<std::atomic<bool>>(false).get()));
     }
     EXPECT_TRUE(first.try_lock());
 }
@@ -49,13 +57,13 @@ TEST_F(JournalLock, WritersAndTheCommandWaitUntilTheLockIsReleased)
         std::future<int> add; // joined after the holder has gone
         named_mutex_lock holder(kStatus);
         ASSERT_TRUE(holder.lock());
-        add = std::async(std::launch::async,
-                         [this, command]
-                         {
-                             wxString line = "2\tb";
-                             return command ? RunTool({"status", "add", "2\tb"}).status
-                                            : Journal(StatusJournal()).AddJob(line);
-                         });
+        add = std::async(
+            std::launch::async,
+            [this, command]
+            {
+                wxString line = "2\tb";
+                return command ? RunTool({"status", "add", "2\tb"}) : Journal(StatusJournal()).AddJob(line);
+            });
         ASSERT_TRUE(WaitUntilBlockedOn(
             LockFile(kStatus),
             [&add] { return add.wait_for(std::chrono::seconds(0)) == std::future_status::ready; }));
@@ -82,42 +90,22 @@ TEST_F(JournalLock, AReaderThatMustNotWaitGivesUpWithLockFailedAndKeepsItsLines)
     EXPECT_EQ(journal.AddJob(line), wyx::JobLockFailed);
     EXPECT_EQ(Utf8(line), "2\tb");
     EXPECT_EQ(ReadBytes(LogJournal()), kOne);
-    named_mutex_lock lock(kLog);
-    EXPECT_FALSE(lock.lock(&running));
-}
-
-TEST_F(JournalLock, AWaitEndsWhenTheFlagTurnsFalseAndSucceedsOnceReleased)
-{
+    // A wait ends when the flag turns false, and succeeds once the lock is released.
     for (bool release : {false, true})
     {
-        std::atomic<bool> running{true};
-        std::future<bool> wait;
-        named_mutex_lock holder(kLog);
-        ASSERT_TRUE(holder.lock());
-        wait = std::async(std::launch::async,
-                          [&running]
-                          {
-                              named_mutex_lock lock(kLog);
-                              return lock.lock(&running);
-                          });
-        if (release)
-            holder.unlock();
-        else
-            running = false;
+        std::atomic<bool> waiting{true};
+        std::future<bool> wait = std::async(std::launch::async,
+                                            [&waiting]
+                                            {
+                                                named_mutex_lock lock(kLog);
+                                                return lock.lock(&waiting);
+                                            });
+        (release ? holder.unlock() : void(waiting = false));
         EXPECT_EQ(wait.get(), release);
     }
 }
 
-TEST_F(JournalLock, TheLockFileAndItsFolderAreMadeForEveryUser)
-{
-    const mode_t previous = ::umask(077);
-    EXPECT_TRUE(named_mutex_lock(kStatus).try_lock());
-    ::umask(previous);
-    EXPECT_EQ(fs::status(LockFile(kStatus)).permissions(), static_cast<fs::perms>(0666));
-    EXPECT_EQ(fs::status(Root() + "/dev/shm").permissions(), static_cast<fs::perms>(01777));
-}
-
-TEST_F(JournalLock, ALinkAtTheLockFileIsNotFollowed)
+TEST_F(JournalLock, ALinkAtTheLockFileIsNotFollowedAndALockThatCannotBeMadeLocksNothing)
 {
     fs::create_directories(Root() + "/dev/shm");
     WriteBytes(Root() + "/victim", "untouched");
@@ -128,22 +116,19 @@ TEST_F(JournalLock, ALinkAtTheLockFileIsNotFollowed)
     EXPECT_FALSE(lock.try_lock());
     EXPECT_EQ(Journal(StatusJournal()).DeleteJob("1"), wyx::JobLockFailed);
     EXPECT_EQ(ReadBytes(StatusJournal()), kOne);
-}
+    EXPECT_EQ(ReadBytes(Root() + "/victim"), "untouched");
 
-TEST_F(JournalLock, AMutexThatCannotBeMadeLocksNothing)
-{
+    fs::remove_all(Root() + "/dev");
     WriteBytes(Root() + "/dev", "a file where the lock folder belongs");
-    named_mutex_lock lock(kStatus);
-    EXPECT_FALSE(lock.lock());
-    EXPECT_FALSE(lock.try_lock());
-    lock.unlock();
+    named_mutex_lock unmade(kLog);
+    EXPECT_FALSE(unmade.lock());
+    EXPECT_FALSE(unmade.try_lock());
+    unmade.unlock();
 }
 
 // --- a rewrite replaces the journal whole or not at all ---------------------------------
 
 using AtomicWrite = JournalTest;
-using JournalPlant = JournalTest;
-using JournalPermission = JournalTest;
 
 TEST_F(AtomicWrite, ARewriteIsANewFileWithTheOldModeAndOwnerAndLinksStayLinks)
 {
@@ -155,7 +140,7 @@ TEST_F(AtomicWrite, ARewriteIsANewFileWithTheOldModeAndOwnerAndLinksStayLinks)
         ASSERT_EQ(::chown(StatusJournal().c_str(), 4321, 4322), 0);
     struct stat before = {}, after = {};
     ASSERT_EQ(::stat(StatusJournal().c_str(), &before), 0);
-    ASSERT_EQ(RunTool({"status", "add", "2\tb"}).status, 0);
+    ASSERT_EQ(RunTool({"status", "add", "2\tb"}), 0);
     ASSERT_EQ(::stat(StatusJournal().c_str(), &after), 0);
     EXPECT_NE(after.st_ino, before.st_ino);
     EXPECT_EQ(after.st_mode & 07777, 0640u);
@@ -166,42 +151,37 @@ TEST_F(AtomicWrite, ARewriteIsANewFileWithTheOldModeAndOwnerAndLinksStayLinks)
 
     WriteBytes(Root() + "/real.txt", kOne);
     fs::create_symlink(Root() + "/real.txt", LogJournal());
-    ASSERT_EQ(RunTool({"log", "commit", "1"}).status, 0);
+    ASSERT_EQ(RunTool({"log", "commit", "1"}), 0);
     EXPECT_TRUE(fs::is_symlink(LogJournal()));
     EXPECT_EQ(ReadBytes(Root() + "/real.txt"), "1\ta\tCOMMIT\r\n");
 }
 
-TEST_F(AtomicWrite, AFileTooLargeForTheProcessLeavesTheJournalIntact)
+TEST_F(AtomicWrite, AWriteThatFailsLeavesTheJournalIntact)
 {
     // The file size limit makes the new file's write fail as a full disk
     // would, even for root; its signal must not end the tool beside its temporary file.
     const std::string original(2000, 'x');
     WriteBytes(LogJournal(), original);
-    EXPECT_EQ(RunTool({"log", "add", "new\tn.pdf"}, "ulimit -f 1;").status, wyx::JobWriteFailed);
+    EXPECT_EQ(RunTool({"log", "add", "new\tn.pdf"}, "ulimit -f 1;"), wyx::JobWriteFailed);
     EXPECT_EQ(ReadBytes(LogJournal()), original);
-    EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsLogFile.txt"});
-}
-
-TEST_F(AtomicWrite, ATemporaryFileThatCannotBeMadeLeavesTheJournalIntact)
-{
+    fs::remove(LogJournal());
     // At the file system's name limit there is no room for the temporary's name.
-    const std::string name = std::string(250, 'j') + ".txt";
-    WriteBytes(DataDirectory() + name, kOne);
-    wyx::JobsFileReadWriter journal = Journal(DataDirectory() + name);
+    const std::string name = DataDirectory() + std::string(250, 'j') + ".txt";
+    WriteBytes(name, kOne);
+    wyx::JobsFileReadWriter journal = Journal(name);
     wxString line = "2\tb";
     EXPECT_EQ(journal.AddJob(line), wyx::JobWriteFailed);
     EXPECT_EQ(journal.DeleteJob("1"), wyx::JobWriteFailed);
     EXPECT_EQ(journal.ClearJobs(), wyx::JobWriteFailed);
-    EXPECT_EQ(ReadBytes(DataDirectory() + name), kOne);
-    EXPECT_EQ(FolderEntries(DataDirectory()), Lines{name});
-    EXPECT_EQ(ReadLines(DataDirectory() + name), Lines{"1\ta\tADDED"});
+    EXPECT_EQ(ReadBytes(name), kOne);
+    EXPECT_EQ(FolderEntries(DataDirectory()), Lines{fs::path(name).filename().string()});
 }
 
-// --- links another user planted -----------------------------------------------------------
+// --- what another user planted: links, and things that are no file ---------------------------
 
-using JournalLink = JournalTest;
+using JournalPlant = JournalTest;
 
-TEST_F(JournalLink, IsWrittenThroughOnlyWhenEveryLinkIsTheWritersOwn)
+TEST_F(JournalPlant, ALinkIsWrittenThroughOnlyWhenEveryLinkIsTheWritersOwn)
 {
     if (::geteuid() != 0)
         GTEST_SKIP() << "only root can give a link to another user";
@@ -221,17 +201,14 @@ TEST_F(JournalLink, IsWrittenThroughOnlyWhenEveryLinkIsTheWritersOwn)
                 fs::create_symlink(i + 1 == owners.size() ? target : link(i + 1), link(i));
                 ASSERT_EQ(::lchown(link(i).c_str(), owners[i] ? 4321 : 0, owners[i] ? 4321 : 0), 0);
             }
-            EXPECT_EQ(RunTool(operation).status, followed ? wyx::JobOk : wyx::JobWriteFailed);
+            EXPECT_EQ(RunTool(operation), followed ? wyx::JobOk : wyx::JobWriteFailed);
             EXPECT_EQ(ReadBytes(target) == kOne, !followed);
-            EXPECT_TRUE(fs::is_symlink(StatusJournal()));
             for (const std::string& entry : FolderEntries(Root()))
                 EXPECT_NE(entry.rfind(".own-file", 0), 0u) << "a temporary was left: " << entry;
             for (std::size_t i = 0; i < owners.size(); ++i)
                 fs::remove(link(i));
         }
 }
-
-// --- things that are no file, at the journal's path ---------------------------------------
 
 TEST_F(JournalPlant, WhatIsNoFileIsNeitherReadNorWrittenAndNothingWaits)
 {
@@ -246,19 +223,15 @@ TEST_F(JournalPlant, WhatIsNoFileIsNeitherReadNorWrittenAndNothingWaits)
     {
         plant(StatusJournal());
         for (const Arguments& operation : operations)
-        {
-            const ToolRun run = RunTool(operation);
-            EXPECT_EQ(run.status, wyx::JobFileMissing) << name << ": " << operation[1];
-            EXPECT_EQ(run.out, "") << name << ": " << operation[1];
-        }
+            EXPECT_EQ(Run("exec " + Quoted(WYX_JOURNAL_TOOL), operation),
+                      std::make_pair(int(wyx::JobFileMissing), std::string()))
+                << name << ": " << operation[1];
         EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsStatusFile.txt"}) << name;
         fs::remove(StatusJournal());
     }
 }
 
-// --- a journal the writer may not write --------------------------------------------------
-
-TEST_F(JournalPermission, AReadOnlyJournalIsReplacedByRootAloneNeverBehindItsOwnersBack)
+TEST_F(JournalPlant, AReadOnlyJournalIsReplacedByRootAloneNeverBehindItsOwnersBack)
 {
     if (::geteuid() != 0)
         GTEST_SKIP() << "needs root to run the command as another user";
@@ -268,14 +241,16 @@ TEST_F(JournalPermission, AReadOnlyJournalIsReplacedByRootAloneNeverBehindItsOwn
     fs::permissions(DataDirectory(), fs::perms::all | fs::perms::sticky_bit);
     fs::create_directories(Root() + "/dev/shm");
     fs::permissions(Root() + "/dev/shm", fs::perms::all | fs::perms::sticky_bit);
-    const std::string asNobody = "exec setpriv --reuid=65534 --regid=65534 --clear-groups ";
     for (Arguments operation : kWritingOperations)
     {
         WriteBytes(StatusJournal(), kOne);
         ASSERT_EQ(::chmod(StatusJournal().c_str(), 0444), 0);
         ASSERT_EQ(::chown(StatusJournal().c_str(), 65534, 65534), 0);
         operation[0] = StatusJournal();
-        EXPECT_EQ(Run(asNobody + Quoted(WYX_JOURNAL_TOOL), operation).status, wyx::JobWriteFailed)
+        EXPECT_EQ(Run("exec setpriv --reuid=65534 --regid=65534 --clear-groups " + Quoted(WYX_JOURNAL_TOOL),
+                      operation)
+                      .first,
+                  wyx::JobWriteFailed)
             << operation[1];
         EXPECT_EQ(ReadBytes(StatusJournal()), kOne) << operation[1];
         EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsStatusFile.txt"});
@@ -283,81 +258,57 @@ TEST_F(JournalPermission, AReadOnlyJournalIsReplacedByRootAloneNeverBehindItsOwn
     }
     WriteBytes(StatusJournal(), kOne);
     ASSERT_EQ(::chmod(StatusJournal().c_str(), 0444), 0);
-    ASSERT_EQ(RunTool({"status", "commit", "1"}).status, 0);
+    ASSERT_EQ(RunTool({"status", "commit", "1"}), 0);
     EXPECT_EQ(ReadBytes(StatusJournal()), "1\ta\tCOMMIT\r\n");
 }
 
-// --- the service simulator: never through what another user planted -----------------------
-
-class SimulatorFiles : public JournalTest
+// The service simulator never writes through what another user planted, and its
+// status tells whether every write was made.
+TEST_F(JournalPlant, TheSimulatorWritesThroughNoLink)
 {
-protected:
-    std::string HotFolderRoot() const { return Root() + "/srv/hotfolders"; }
-    std::string Victim() const { return Root() + "/victim.txt"; }
-    HotFolderSimulator Simulator() const
-    {
-        SimulatorOptions options;
-        options.jobsPerSecond = 200;
-        options.durationSeconds = 0.1;
-        options.stepSeconds = 0.002;
-        options.failureShare = 1;
-        options.seed = 7;
-        options.seedGiven = true;
-        options.dataDirectory = DataDirectory();
-        options.hotFolderRoot = HotFolderRoot();
-        return HotFolderSimulator(options, [] { return false; });
-    }
-    void SetUp() override
-    {
-        JournalTest::SetUp();
-        WriteBytes(Victim(), "not the simulator's\n");
-    }
-    void TearDown() override { EXPECT_EQ(ReadBytes(Victim()), "not the simulator's\n"); }
-};
-
-TEST_F(SimulatorFiles, LinksAtHotFoldersIniAreNotWrittenThroughUnlessTheyAreOwn)
-{
-    if (::geteuid() != 0)
-        GTEST_SKIP() << "only root can give a link to another user";
-    fs::create_symlink(Victim(), DataDirectory() + "HotFolders.ini.new"); // the old temporary name
+    const std::string hotFolders = Root() + "/srv/hotfolders", victim = Root() + "/victim.txt";
+    WriteBytes(victim, "not the simulator's\n");
+    SimulatorOptions options;
+    options.jobsPerSecond = 200;
+    options.durationSeconds = 0.1;
+    options.stepSeconds = 0.002;
+    options.failureShare = 1;
+    options.seed = 7;
+    options.seedGiven = true;
+    options.dataDirectory = DataDirectory();
+    options.hotFolderRoot = hotFolders;
+    HotFolderSimulator simulator(options, [] { return false; });
     wxString problem;
-    ASSERT_TRUE(Simulator().Prepare(problem)) << problem;
-    EXPECT_TRUE(fs::is_regular_file(fs::symlink_status(DataDirectory() + "HotFolders.ini")));
-    EXPECT_NE(ReadBytes(DataDirectory() + "HotFolders.ini").find("[Servers]"), std::string::npos);
-
-    fs::remove(DataDirectory() + "HotFolders.ini");
-    fs::create_symlink(Victim(), DataDirectory() + "HotFolders.ini");
-    ASSERT_EQ(::lchown((DataDirectory() + "HotFolders.ini").c_str(), 4321, 4321), 0);
-    EXPECT_FALSE(Simulator().Prepare(problem));
-}
-
-TEST_F(SimulatorFiles, ErrorMarkersAreNeverWrittenThroughALink)
-{
-    HotFolderSimulator simulator = Simulator();
-    wxString problem;
+    if (::geteuid() == 0) // only root can give a link to another user
+    {
+        fs::create_symlink(victim, DataDirectory() + "HotFolders.ini");
+        ASSERT_EQ(::lchown((DataDirectory() + "HotFolders.ini").c_str(), 4321, 4321), 0);
+        EXPECT_FALSE(HotFolderSimulator(options, [] { return false; }).Prepare(problem));
+        fs::remove(DataDirectory() + "HotFolders.ini");
+    }
+    fs::create_symlink(victim, DataDirectory() + "HotFolders.ini.new"); // the old temporary name
     ASSERT_TRUE(simulator.Prepare(problem)) << problem;
+    EXPECT_TRUE(fs::is_regular_file(fs::symlink_status(DataDirectory() + "HotFolders.ini")));
     std::size_t folders = 0;
-    for (const auto& entry : fs::recursive_directory_iterator(HotFolderRoot()))
+    for (const auto& entry : fs::recursive_directory_iterator(hotFolders))
         if (entry.is_directory() && entry.path().filename() == "[_KELVO_HotFolder_]" && ++folders)
-            fs::create_symlink(Victim(), entry.path() / "Error.er");
+            fs::create_symlink(victim, entry.path() / "Error.er");
     ASSERT_GT(folders, 0u);
     const HotFolderSimulator::Totals totals = simulator.Run();
     ASSERT_GT(totals.failed, 0u);
     EXPECT_EQ(totals.markerErrors, totals.failed);
     EXPECT_EQ(totals.journalErrors, 0u);
     EXPECT_FALSE(totals.AllWritten());
-}
+    EXPECT_EQ(ReadBytes(victim), "not the simulator's\n");
 
-TEST_F(SimulatorFiles, TheProgramsStatusTellsWhetherEveryWriteWasMade)
-{
     const Arguments arguments{"--rate",         "200/s",         "--duration",       "0.1",
                               "--step-seconds", "0.002",         "--seed",           "7",
-                              "--data-dir",     DataDirectory(), "--hotfolder-root", HotFolderRoot()};
-    const std::string simulator = "exec 2>/dev/null " + Quoted(WYX_SIMULATOR_TOOL);
-    EXPECT_EQ(Run(simulator, arguments).status, 0);
+                              "--data-dir",     DataDirectory(), "--hotfolder-root", Root() + "/srv/other"};
+    const std::string program = "exec 2>/dev/null " + Quoted(WYX_SIMULATOR_TOOL);
+    EXPECT_EQ(Run(program, arguments).first, 0);
     fs::remove(StatusJournal());
     fs::create_directories(StatusJournal());
-    EXPECT_EQ(Run(simulator, arguments).status, 3);
+    EXPECT_EQ(Run(program, arguments).first, 3);
 }
 
 } // namespace

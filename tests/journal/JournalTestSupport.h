@@ -27,12 +27,6 @@ namespace fs = std::filesystem;
 using Lines = std::vector<std::string>;
 using Arguments = std::vector<std::string>;
 
-struct ToolRun
-{
-    int status = -1;
-    std::string out;
-};
-
 // A fresh system root for one test: WYX_SYSTEM_ROOT names a new temporary
 // folder, which holds the data directory and the lock folder.
 class JournalTest : public ::testing::Test
@@ -65,12 +59,11 @@ public:
         return names;
     }
     static std::string Utf8(const wxString& text) { return text.utf8_string(); }
-    static wxString FromUtf8(const std::string& text) { return wxString::FromUTF8(text.data(), text.size()); }
     static Lines Utf8Lines(const wxArrayString& lines)
     {
         Lines result;
         for (const wxString& line : lines)
-            result.push_back(Utf8(line));
+            result.push_back(line.utf8_string());
         return result;
     }
 
@@ -78,7 +71,7 @@ public:
     static wyx::JobsFileReadWriter Journal(const std::string& path)
     {
         wyx::JobsFileReadWriter journal;
-        journal.SetPath(FromUtf8(path));
+        journal.SetPath(wxString::FromUTF8(path));
         return journal;
     }
     // ReadJobs as UTF-8; fails the test unless the result is JobOk.
@@ -96,24 +89,23 @@ public:
             quoted += c == '\'' ? std::string("'\\''") : std::string(1, c);
         return quoted + "'";
     }
-    // Runs a command through sh with the arguments quoted, collecting its output.
-    static ToolRun Run(std::string command, const Arguments& arguments)
+    // Runs a command through sh with the arguments quoted; its exit status and output.
+    static std::pair<int, std::string> Run(std::string command, const Arguments& arguments)
     {
         for (const std::string& argument : arguments)
             command += " " + Quoted(argument);
-        ToolRun run;
+        std::string out;
         std::FILE* process = ::popen(command.c_str(), "r");
         char block[4096];
         for (std::size_t got; process && (got = std::fread(block, 1, sizeof block, process)) > 0;)
-            run.out.append(block, got);
+            out.append(block, got);
         const int status = process ? ::pclose(process) : -1;
-        run.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-        return run;
+        return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, out};
     }
-    // wyx-journal; prefix is shell text put before it (ulimit, redirections).
-    static ToolRun RunTool(const Arguments& arguments, const std::string& prefix = "")
+    // wyx-journal's exit status; prefix is shell text put before it (ulimit, redirections).
+    static int RunTool(const Arguments& arguments, const std::string& prefix = "")
     {
-        return Run(prefix + " exec " + Quoted(WYX_JOURNAL_TOOL), arguments);
+        return Run(prefix + " exec " + Quoted(WYX_JOURNAL_TOOL), arguments).first;
     }
 
     // Polls the kernel's lock table until someone is blocked waiting for the
