@@ -161,16 +161,6 @@ wxString CLibraryFormat(locale_t locale, const char* format, const CalendarField
 // Installed locales of several scripts, encodings and 12/24-hour clocks.
 TEST(LocaleReference, DateAndTimeEqualTheCLibrarysFormats)
 {
-    // One moment in each month and on each week day, at hours around the 12-hour edges.
-    std::vector<CalendarFields> moments;
-    for (unsigned i = 0; i < 12; ++i)
-    {
-        const wxDateTime day(static_cast<wxDateTime::wxDateTime_t>(1 + i * 2),
-                             static_cast<wxDateTime::Month>(i), 2000 + static_cast<int>(i * 9));
-        const unsigned hours[] = {0, 1, 9, 11, 12, 13, 23};
-        moments.push_back({static_cast<unsigned>(day.GetYear()), i + 1, day.GetDay(),
-                           static_cast<unsigned>(day.GetWeekDay()), hours[i % 7], i * 5 + 1, 58 - i * 4});
-    }
     for (const wxString& name :
          wxSplit("C en_US.UTF-8 de_DE.UTF-8 fr_FR.UTF-8 ja_JP.UTF-8 en_GB.UTF-8 zh_CN.UTF-8 "
                  "ko_KR.UTF-8 ru_RU.UTF-8 cs_CZ.UTF-8 tr_TR.UTF-8 fi_FI.UTF-8 pt_BR.UTF-8 "
@@ -183,8 +173,18 @@ TEST(LocaleReference, DateAndTimeEqualTheCLibrarysFormats)
         ASSERT_TRUE(reference != nullptr && wyxos::ReadLocaleTimeInfo(name, info) && info.hasDatePattern &&
                     info.hasTimePattern)
             << "not installed or not converted";
-        for (const CalendarFields& fields : moments)
+        // One moment in each month and on each week day, at hours around the 12-hour edges.
+        for (unsigned i = 0; i < 12; ++i)
         {
+            const unsigned hours[] = {0, 1, 9, 11, 12, 13, 23};
+            const wxDateTime day(1 + i * 2, static_cast<wxDateTime::Month>(i), 2000 + i * 9);
+            const CalendarFields fields{static_cast<unsigned>(day.GetYear()),
+                                        i + 1,
+                                        day.GetDay(),
+                                        static_cast<unsigned>(day.GetWeekDay()),
+                                        hours[i % 7],
+                                        i * 5 + 1,
+                                        58 - i * 4};
             EXPECT_EQ(FormatLocaleDate(fields, info), CLibraryFormat(reference, "%x", fields))
                 << info.datePattern;
             EXPECT_EQ(FormatLocaleTime(fields, info), CLibraryFormat(reference, "%X", fields))
