@@ -35,7 +35,7 @@ template <typename List> wxString Headings(const List* list)
     return texts;
 }
 
-TEST(GermanWindowTest, TabsHeadingsRowsAndFootersAreGerman)
+TEST(GermanWindowTest, TabsHeadingsLogRowsAndTheFooterAreGerman)
 {
     wxLocale locale;
     ASSERT_TRUE(locale.Init(wxLANGUAGE_GERMAN_GERMANY, wxLOCALE_LOAD_DEFAULT))
