@@ -123,8 +123,8 @@ TEST(StrftimeConversion, GivesTheWindowsLettersOrRefuses)
     for (const wxString& c :
          wxSplit("D%e.%m.%Y=d.MM.yyyy|D%-d.%-m.%Y=d.M.yyyy|D%a %d %b %Y=ddd dd MMM yyyy|"
                  "D%A, %B %d=dddd, MMMM dd|D%D %F=MM/dd/yy yyyy-MM-dd|T%R %k %l %p=HH:mm H h tt|"
-                 "T%H%%%M=HH%mm|D%Y-%m-%d KW=yyyy-MM-dd KW|T%M%S=mmss|T%r=tt hh:mm|T%Hh%M=|D%Y y=|"
-                 "D%d%e=|T%H%k=|D%Ey=|D%j=|D%x=|D%H:%M=|T%d %H=|T%P=|D%-y=|T%H%=",
+                 "T%H%%%M=HH%mm|T%H%t%M%n=HH\tmm\n|D%Y-%m-%d KW=yyyy-MM-dd KW|T%M%S=mmss|T%r=tt hh:mm|"
+                 "T%Hh%M=|D%Y y=|D%d%e=|T%H%k=|D%Ey=|D%j=|D%x=|D%H:%M=|T%d %H=|T%P=|D%-y=|T%H%=",
                  '|'))
     {
         const wxString expected = c.AfterFirst('=');
