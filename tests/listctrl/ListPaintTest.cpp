@@ -27,18 +27,24 @@ const wxColour kRed(220, 0, 0);
 using ListPaint = ListFixture;
 
 // The vertical rules stand two pixels left of each column's edge, from the top to the line under the
-// last row; a line under each row and none above the first.
+// last row; a line under each row and none above the first. Each kind of rule alone, or both.
 TEST_F(ListPaint, RulesSeparateRowsAndColumnsAndCloseTheLastItem)
 {
-    auto* list = MakeRows(wxLC_HRULES | wxLC_VRULES, {100, 80}, 3, wxS(" "));
-    const int lh = list->GetMainWindow()->GetLineHeight();
-    const wxImage image = RenderRows(list);
-    const wxColour line = ListTheme().lineColour;
-    EXPECT_EQ(CountPixels(image, wxRect(0, lh / 2, 200, 1), line), 2);
-    EXPECT_EQ(PixelAt(image, 98, lh / 2), line);
-    EXPECT_EQ(CountPixels(image, wxRect(50, 0, 1, 4 * lh + 1), line), 3);
-    EXPECT_EQ(PixelAt(image, 50, 3 * lh), line) << "under the last row";
-    EXPECT_EQ(PixelAt(image, 98, 3 * lh + 1), *wxWHITE);
+    for (const long style : {wxLC_HRULES | wxLC_VRULES, wxLC_HRULES, wxLC_VRULES})
+    {
+        auto* list = MakeRows(style, {100, 80}, 3, wxS(" "));
+        const int lh = list->GetMainWindow()->GetLineHeight();
+        const wxImage image = RenderRows(list);
+        const wxColour line = ListTheme().lineColour;
+        const bool across = style & wxLC_HRULES, down = style & wxLC_VRULES;
+        EXPECT_EQ(CountPixels(image, wxRect(0, lh / 2, 200, 1), line), down ? 2 : 0) << style;
+        EXPECT_EQ(PixelAt(image, 98, lh / 2) == line, down) << style;
+        EXPECT_EQ(CountPixels(image, wxRect(50, 0, 1, 4 * lh + 1), line), across ? 3 : 0) << style;
+        EXPECT_EQ(PixelAt(image, 50, 3 * lh) == line, across) << "under the last row";
+        EXPECT_EQ(PixelAt(image, 98, 3 * lh + 1), *wxWHITE) << style;
+        m_frame->Destroy();
+        m_frame = nullptr;
+    }
 }
 
 // Status marks take the row's text colour while the text keeps the theme's.
@@ -111,6 +117,8 @@ TEST_F(ListPaint, StyledHeaderShowsBordersLabelsAndSortMarks)
     EXPECT_EQ(PixelAt(image, 100 - 1, 12), border) << "right edge less the strip's width";
     EXPECT_GT(CountPixels(image, wxRect(0, 0, 30, 25), kRed), 10) << "label at the left, in the text colour";
     EXPECT_EQ(CountPixels(image, wxRect(100, 0, 119, 25), wxColour(0, 160, 0)), 16 * 16) << "the sort mark";
+    EXPECT_TRUE(list->GetColumn(1, mark) && mark.GetImage() == 0 && mark.GetText() == kBlock)
+        << "as the view reads it";
     list->SetImageList(nullptr, kHeaderImageList);
 }
 
@@ -146,19 +154,17 @@ TEST_F(ListPaint, HeaderIsRepaintedForANewTitleOrWidth)
 }
 // ---------------------------------------------------------------- job table
 
-// Display rows by position: key, file, folder, server, size, format, time, status.
-JobRecord Row(const wxString& file, const wxString& status)
-{
-    return JobRecord{wxS("k-") + file, file,       wxS("Folder A"), wxS("srv1"),
-                     wxS("2KB"),       wxS("PDF"), wxS("10:41"),    status};
-}
-
 TEST_F(ListPaint, JobTableColumnsShowTheRowNumberAndTheirFieldsAndOnlyInProgressRowsTheStatusImage)
 {
     auto* table =
         MakeList<CustomListCtrl>(wxLC_SINGLE_SEL | wxLC_VIRTUAL | wxLC_REPORT | wxLC_HRULES | wxLC_VRULES);
     for (int column = 0; column < 8; ++column)
         table->InsertColumn(column, wxS("C"), wxLIST_FORMAT_LEFT, 70);
+    // Display rows by position: key, file, folder, server, size, format, time, status.
+    const auto Row = [](const wxString& file, const wxString& status) {
+        return JobRecord{file,       file,       wxS("Folder A"), wxS("srv1"),
+                         wxS("2KB"), wxS("PDF"), wxS("10:41"),    status};
+    };
     table->SetItemCount(2);
     table->SetRecords({Row(wxS("first"), wxS("Saving...")), Row(wxS("second"), wxS("Waiting"))});
     wxString shown;
@@ -186,7 +192,7 @@ TEST_F(ListPaint, JobTableColumnsShowTheRowNumberAndTheirFieldsAndOnlyInProgress
 // ---------------------------------------------------------------- text drawing
 
 // `text` in `font` drawn once by `draw` and once by wxDC::DrawText: the first difference, or "".
-std::string Compare(const wxFont& font, const std::function<void(wxDC&)>& draw, const wxString& text)
+std::string Compare(const wxFont& font, const wxString& text, const std::function<void(wxDC&)>& draw)
 {
     const auto render = [&](const std::function<void(wxDC&)>& paint)
     {
@@ -215,10 +221,7 @@ TEST(ListTextLayout, DrawsWhatDrawTextDrawsAndShortensWithAnEllipsis)
     for (const wxFont& font : {*wxNORMAL_FONT, wxFont(*wxNORMAL_FONT), wxFont(wxFontInfo(15).Bold())})
         for (const wxString& text : texts)
             for (int round = 0; round < 2; ++round)
-                EXPECT_EQ(Compare(
-                              font, [&](wxDC& dc) { cache.DrawText(dc, text, 7, 9); }, text),
-                          "")
-                    << text;
+                EXPECT_EQ(Compare(font, text, [&](wxDC& dc) { cache.DrawText(dc, text, 7, 9); }), "") << text;
     EXPECT_EQ(cache.Size(), 2u);
 
     const wxString text = wxS("A rather long file name.pdf");
@@ -229,7 +232,7 @@ TEST(ListTextLayout, DrawsWhatDrawTextDrawsAndShortensWithAnEllipsis)
     EXPECT_TRUE(shown.EndsWith(wxS("...")) && text.StartsWith(shown.Left(shown.length() - 3))) << shown;
     EXPECT_LE(dc.GetTextExtent(shown).GetWidth(), 60);
     const auto draw = [&](wxDC& on) { DrawTextTruncate(on, text, wxRect(7, 9, 60, 20), 0, false); };
-    EXPECT_EQ(Compare(*wxNORMAL_FONT, draw, shown), "");
+    EXPECT_EQ(Compare(*wxNORMAL_FONT, shown, draw), "");
     EXPECT_EQ(TruncateTextToWidth(dc, text, 1000, false) + "|" + TruncateTextToWidth(dc, text, 2, true),
               text + "|")
         << "an image cell shows no lone ellipsis";

@@ -68,7 +68,6 @@ protected:
         m_frame = new wxFrame(nullptr, wxID_ANY, wxS("list test"));
         m_frame->SetClientSize(600, 400);
         auto* list = new List(header, m_frame, wxID_ANY, wxDefaultPosition, wxSize(600, 400), style);
-        list->SetSize(0, 0, 600, 400);
         m_frame->Show();
         return list;
     }
