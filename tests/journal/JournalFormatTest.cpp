@@ -59,6 +59,7 @@ TEST_F(JournalFormat, AnEditLeavesEveryOtherLineByteForByte)
 TEST_F(JournalFormat, KeysMatchForDeleteCommitAndModifyWhenEqualButForTrailingBlanks)
 {
     for (const auto& [storedKey, given, m] : {std::tuple<std::string, std::string, bool>{"42", "42 ", true},
+                                              {"42   ", "42", true},
                                               {"42", "042", false},
                                               {"42", "4", false},
                                               {" 42", "42", false}})
