@@ -184,12 +184,14 @@ TEST_F(ListInput, RowsKeepTheirSelectionTextsAndDataThroughInsertsAndDeletes)
     EXPECT_TRUE(m_list->DeleteItem(2) && m_list->SetItemData(0, 42));
     EXPECT_EQ(m_list->InsertItem(99, wxS("appended")), 6) << "an index past the end appends";
     Run("select 0|S0|0 3 @3;");
-    EXPECT_EQ(m_list->GetItemText(3) + m_list->GetItemText(6), wxS("row 3appended"));
-    EXPECT_EQ(m_list->GetItemData(0), 42u);
+    EXPECT_EQ(m_list->GetItemText(3) + m_list->GetItemText(6) +
+                  wxString::Format("%d", int(m_list->GetItemData(0))),
+              wxS("row 3appended42"));
     wxListItem info;
     info.SetId(0);
-    info.SetMask(wxLIST_MASK_IMAGE);
-    EXPECT_TRUE(m_list->GetItem(info) && info.GetImage() == 0);
+    info.SetMask(wxLIST_MASK_IMAGE | wxLIST_MASK_STATE);
+    info.SetStateMask(wxLIST_STATE_SELECTED);
+    EXPECT_TRUE(m_list->GetItem(info) && info.GetImage() == 0 && info.GetState() == wxLIST_STATE_SELECTED);
     m_list->DeleteAllItems();
     Run("top 0||@-1;");
 }
