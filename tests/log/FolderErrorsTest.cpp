@@ -14,14 +14,6 @@ namespace
 
 const auto* const g_wx = ::testing::AddGlobalTestEnvironment(new logtest::WxEnvironment);
 
-TEST(FolderErrorRules, MarkersLieInTheHotFoldersOwnSubfolderAndOnlyExactSettingsSelectARefresh)
-{
-    EXPECT_EQ("/jobs/In/[_KELVO_HotFolder_]/Error.er", ErrorMarkerPath("/jobs/In/"));
-    EXPECT_EQ("/srv/PDF Proofs/[_KELVO_HotFolder_]/Error.er", ErrorMarkerPath("/srv/PDF Proofs"));
-    for (const char* other : {"", " 1", "01", "O"})
-        EXPECT_EQ(IconRefreshMode::None, IconRefreshModeFromSetting(other)) << other;
-}
-
 // Three hot folders, each marked with an error, and a log model whose journal
 // names failed jobs in the third and the second.
 struct Scene
@@ -40,10 +32,6 @@ struct Scene
     }
     static void Mark(const wxString& folder) { SystemRoot::WriteFile(ErrorMarkerPath(folder), "error"); }
     static bool IsMarked(const wxString& folder) { return wxFileName::Exists(ErrorMarkerPath(folder)); }
-    void UseSetting(const wxString& setting)
-    {
-        model.SetIconRefreshSettingSource([setting] { return setting; });
-    }
     // The folders whose icons were refreshed since the scene began; never to an error icon.
     std::vector<wxString> IconCalls() const
     {
@@ -63,21 +51,21 @@ struct Scene
 // Runs before any configuration is loaded (the store keeps the first value it
 // meets for a key): without a choice the setting is "0". The marker of
 // folders[1] cannot be removed: a folder of that name with something in it.
-TEST(FolderErrors, AcknowledgingAndClearLogRemoveTheMarkersAndRefreshAsTheSettingSays)
+TEST(FolderErrors, AcknowledgingAndClearLogRemoveTheMarkersAndRefreshAsOnlyTheExactSettingSays)
 {
     EXPECT_EQ("0", ReadIconRefreshSetting());
-    struct Mode
+    EXPECT_EQ("/jobs/In/[_KELVO_HotFolder_]/Error.er", ErrorMarkerPath("/jobs/In/"));
+    for (const char* other : {"", " 1", "01", "O"})
+        EXPECT_EQ(IconRefreshMode::None, IconRefreshModeFromSetting(other)) << other;
+    // No setting of its own: the configuration's, and only then are folder icons refreshed.
+    for (const char* setting : {static_cast<const char*>(nullptr), "1", "2"})
     {
-        const char* setting; // nullptr: the configuration's
-        bool folderIcons;    // else no icon is refreshed and the error folders stay known
-        bool shellNotification;
-    };
-    for (const Mode& mode : {Mode{nullptr, true, false}, Mode{"1", false, true}, Mode{"2", false, false}})
-    {
-        SCOPED_TRACE(mode.setting ? mode.setting : "default");
+        SCOPED_TRACE(setting ? setting : "default");
+        const bool folderIcons = setting == nullptr; // else the error folders stay known
+        const bool shellNotification = setting != nullptr && *setting == '1';
         Scene scene;
-        if (mode.setting)
-            scene.UseSetting(mode.setting);
+        if (setting != nullptr)
+            scene.model.SetIconRefreshSettingSource([setting] { return wxString(setting); });
         const wxString stuck = ErrorMarkerPath(scene.folders[1]);
         wxRemoveFile(stuck);
         ASSERT_TRUE(wxFileName::Mkdir(stuck));
@@ -91,23 +79,23 @@ TEST(FolderErrors, AcknowledgingAndClearLogRemoveTheMarkersAndRefreshAsTheSettin
         EXPECT_FALSE(Scene::IsMarked(scene.folders[2]));
         const std::vector<wxString> none;
         const std::vector<wxString> refreshed = {scene.folders[2], scene.folders[1]};
-        EXPECT_EQ(mode.folderIcons ? refreshed : none, scene.IconCalls());
-        EXPECT_EQ(mode.shellNotification ? 2u : 0u, wyxos::ShellNotificationCount());
+        EXPECT_EQ(folderIcons ? refreshed : none, scene.IconCalls());
+        EXPECT_EQ(shellNotification ? 2u : 0u, wyxos::ShellNotificationCount());
 
         scene.model.ClearLog();
         EXPECT_FALSE(Scene::IsMarked(scene.folders[0]) || Scene::IsMarked(scene.folders[2]));
         EXPECT_TRUE(Scene::IsMarked(scene.folders[1]));
-        EXPECT_EQ(mode.shellNotification ? 3u : 0u, wyxos::ShellNotificationCount());
+        EXPECT_EQ(shellNotification ? 3u : 0u, wyxos::ShellNotificationCount());
         const std::vector<wxString> again = {scene.folders[2], scene.folders[1], scene.folders[2],
                                              scene.folders[1]};
-        EXPECT_EQ(mode.folderIcons ? again : none, scene.IconCalls()) << "the error folders refreshed again";
-        EXPECT_EQ(mode.folderIcons ? 0u : 2u, scene.model.GetErrorFolders().size());
+        EXPECT_EQ(folderIcons ? again : none, scene.IconCalls()) << "the error folders refreshed again";
+        EXPECT_EQ(folderIcons ? 0u : 2u, scene.model.GetErrorFolders().size());
 
         // Nothing failed since: the next reset clears a new marker but refreshes no icon.
         Scene::Mark(scene.folders[0]);
         scene.model.ResetAllFolderErrors();
         EXPECT_FALSE(Scene::IsMarked(scene.folders[0]));
-        EXPECT_EQ(mode.folderIcons ? 4u : 0u, scene.IconCalls().size());
+        EXPECT_EQ(folderIcons ? 4u : 0u, scene.IconCalls().size());
     }
 }
 
