@@ -35,6 +35,21 @@ Keys All(const JobLogManager& model, std::uint64_t* since = nullptr)
     return keys;
 }
 
+// Clears the log from inside a read, as the GUI thread may while the poller reads.
+class ClearingReader : public wyx::JobsFileReadWriter
+{
+public:
+    explicit ClearingReader(const wxString& path) { SetPath(path); }
+    int ReadJobs(wxArrayString& lines) override
+    {
+        const int result = wyx::JobsFileReadWriter::ReadJobs(lines);
+        if (model != nullptr)
+            std::exchange(model, nullptr)->ClearLog();
+        return result;
+    }
+    JobLogManager* model = nullptr;
+};
+
 class LogModel : public ::testing::Test
 {
 protected:
@@ -42,20 +57,19 @@ protected:
     void Append(const wxString& text) { logtest::SystemRoot::AppendFile(m_root.JournalPath(), text); }
 
     logtest::SystemRoot m_root;
-    JobLogManager m_model{m_root.JournalPath()};
+    ClearingReader* m_reader = new ClearingReader(m_root.JournalPath()); // owned by the model
+    JobLogManager m_model{m_root.JournalPath(), std::unique_ptr<wyx::JobsFileReadWriter>(m_reader)};
 };
 
 // Only lines of eight pieces (empty ones do not count) make a record; the first
 // read takes all of them, later reads only ADDED lines of keys not seen yet.
 TEST_F(LogModel, FirstReadTakesEveryWholeLineAndLaterReadsOnlyAddedLinesOfUnseenKeys)
 {
-    Write(wxString::FromUTF8("K1\t/hf/In\t/hf/In/a.pdf\tPRN-7\t1383035055\tDisk full\tno space\tADDED\r\n"
-                             "k2\th\tf\ts\t1\tst\tADDED\r\n"
-                             "k3\th\t\ts\t1\tst\td\tADDED\r\n"
-                             "k4\th\tf\ts\t1\tst\td\tx\tADDED\r\n"
-                             "\tk5\th\tf\ts\t1\tst\td\tADDED\t\r\n"
-                             "k6\t\th\tf\ts\t1\tst\td\tADDED\r\n\r\n\t\t\t\r\n"
-                             "ключ\th\tf\ts\t1\tÉchec\td\tADDED\r\n") +
+    Write(wxString::FromUTF8(
+              "K1\t/hf/In\t/hf/In/a.pdf\tPRN-7\t1383035055\tDisk full\tno space\tADDED\r\n"
+              "k2\th\tf\ts\t1\tst\tADDED\r\nk3\th\t\ts\t1\tst\td\tADDED\r\n"
+              "k4\th\tf\ts\t1\tst\td\tx\tADDED\r\n\tk5\th\tf\ts\t1\tst\td\tADDED\t\r\n"
+              "k6\t\th\tf\ts\t1\tst\td\tADDED\r\n\r\n\t\t\t\r\nключ\th\tf\ts\t1\tÉchec\td\tADDED\r\n") +
           LogLine("42", "COMMIT") + LogLine("42", "MODIFIED"));
     ASSERT_EQ(1, m_model.Parse());
     EXPECT_EQ((Keys{"K1", "k5", "k6", wxString::FromUTF8("ключ"), "42", "42"}), All(m_model));
@@ -152,37 +166,15 @@ TEST_F(LogModel,
     EXPECT_EQ((Keys{"1", "5"}), All(m_model, &cursor)) << "the keys were forgotten";
     EXPECT_EQ((Keys{"1", "5"}), All(m_model, &fresh));
     EXPECT_EQ(cursor, fresh);
-}
 
-// Clears the log from inside a read, as the GUI thread may while the poller reads.
-class ClearingReader : public wyx::JobsFileReadWriter
-{
-public:
-    explicit ClearingReader(const wxString& path) { SetPath(path); }
-    int ReadJobs(wxArrayString& lines) override
-    {
-        const int result = wyx::JobsFileReadWriter::ReadJobs(lines);
-        if (model != nullptr)
-            std::exchange(model, nullptr)->ClearLog();
-        return result;
-    }
-    JobLogManager* model = nullptr;
-};
-
-TEST_F(LogModel, LinesReadBeforeAClearDoNotComeBack)
-{
-    Write(LogLine("1", "ADDED"));
-    auto reader = std::make_unique<ClearingReader>(m_root.JournalPath());
-    ClearingReader& clearing = *reader;
-    JobLogManager model(m_root.JournalPath(), std::move(reader));
-    ASSERT_EQ(1, model.Parse());
-    Append(LogLine("2", "ADDED"));
-    clearing.model = &model;
-    EXPECT_EQ(0, model.Parse());
-    EXPECT_EQ(0u, model.GetRecordCount());
-    Append(LogLine("3", "ADDED"));
-    EXPECT_EQ(1, model.Parse());
-    EXPECT_EQ(Keys{"3"}, All(model)) << "what came after the clear is read at the next poll";
+    // A clear from inside a read: the lines read before it do not come back.
+    Append(LogLine("7", "ADDED"));
+    m_reader->model = &m_model;
+    EXPECT_EQ(0, m_model.Parse());
+    EXPECT_EQ(0u, m_model.GetRecordCount());
+    Append(LogLine("8", "ADDED"));
+    EXPECT_EQ(1, m_model.Parse());
+    EXPECT_EQ(Keys{"8"}, All(m_model)) << "what came after the clear is read at the next poll";
 }
 
 TEST_F(LogModel, ClearLogBesideAnAppendingProducerKeepsEveryLaterLineAndNoEarlierOne)

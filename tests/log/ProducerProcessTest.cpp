@@ -1,7 +1,7 @@
-#include <atomic>
+#include <chrono>
 #include <cstdlib>
+#include <future>
 #include <set>
-#include <thread>
 
 #include <gtest/gtest.h>
 
@@ -37,23 +37,12 @@ TEST(LogModelBesideAProducerProcess, ListsEveryJobExactlyOnceAcrossTrimming)
     logtest::SystemRoot::WriteFile(input, finished);
     const std::string command =
         wxString::Format("'%s' log add - < '%s'", WYX_JOURNAL_TOOL, input).utf8_string();
-    std::atomic<bool> producing{true};
-    int producerStatus = -1;
-    std::thread producer(
-        [&]
-        {
-            producerStatus = std::system(command.c_str());
-            producing = false;
-        });
+    auto producer = std::async(std::launch::async, [&] { return std::system(command.c_str()); });
     // The polling thread's part, driven here until the producer is done.
-    while (producing)
-    {
+    while (producer.wait_for(std::chrono::seconds(0)) != std::future_status::ready)
         model.Parse();
-        std::this_thread::yield();
-    }
-    producer.join();
+    ASSERT_EQ(0, producer.get());
     model.Parse();
-    ASSERT_EQ(0, producerStatus);
 
     EXPECT_LT(wxFileName::GetSize(root.JournalPath()), wxULongLong(seed.utf8_str().length()))
         << "the journal was trimmed";
