@@ -26,23 +26,14 @@ public:
     wxString JournalPath() const { return GetDataDirectory() + "TiveraJobsLogFile.txt"; }
 };
 
-// 15 March 2021, 14:05:30 as an MS-DOS date-time.
-constexpr const char* kDosTime = "1383035055";
-
-// The fields of a log journal line, without its tag: what a producer passes to AddJob.
-inline wxString LogFields(const wxString& key, const wxString& status = "Transferred Successfully",
-                          const wxString& hotFolder = "/srv/hotfolders/In")
-{
-    return key + "\t" + hotFolder + "\t" + hotFolder + "/" + key + ".pdf\tPRN-01\t" + kDosTime + "\t" +
-           status + "\tdetail of " + key;
-}
-
-// One log journal line with its line end.
+// One log journal line with its line end; its DosTime is 15 March 2021, 14:05:30.
+// Without the tab, the tag and the line end: the fields a producer passes to AddJob.
 inline wxString LogLine(const wxString& key, const wxString& tag,
                         const wxString& status = "Transferred Successfully",
                         const wxString& hotFolder = "/srv/hotfolders/In")
 {
-    return LogFields(key, status, hotFolder) + "\t" + tag + "\r\n";
+    return key + "\t" + hotFolder + "\t" + hotFolder + "/" + key + ".pdf\tPRN-01\t1383035055\t" + status +
+           "\tdetail of " + key + "\t" + tag + "\r\n";
 }
 
 } // namespace logtest

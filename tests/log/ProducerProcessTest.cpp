@@ -21,7 +21,7 @@ TEST(LogModelBesideAProducerProcess, ListsEveryJobExactlyOnceAcrossTrimming)
     logtest::SystemRoot root;
     const int jobs = WYX_LOG_PRODUCER_JOBS;
     const int seedLines = 10000 - jobs / 3;
-    wxString seed;
+    wxString seed, finished;
     for (int i = 0; i < seedLines; ++i)
         seed += logtest::LogLine(wxString::Format("seed-%d", i), "ADDED");
     logtest::SystemRoot::WriteFile(root.JournalPath(), seed);
@@ -31,9 +31,8 @@ TEST(LogModelBesideAProducerProcess, ListsEveryJobExactlyOnceAcrossTrimming)
     // One wyx-journal process appends every finished job, each append a whole
     // locked read and rewrite of the journal, as the service does.
     const wxString input = root.Path() + "/finished-jobs.txt";
-    wxString finished;
     for (int i = 0; i < jobs; ++i)
-        finished += logtest::LogFields(wxString::Format("job-%d", i)) + "\n";
+        finished += logtest::LogLine(wxString::Format("job-%d", i), "").BeforeLast('\t') + "\n";
     logtest::SystemRoot::WriteFile(input, finished);
     const std::string command =
         wxString::Format("'%s' log add - < '%s'", WYX_JOURNAL_TOOL, input).utf8_string();

@@ -46,7 +46,7 @@ struct LogModelKind
 {
     using Model = JobLogManager;
     static constexpr const char* kJournal = "TiveraJobsLogFile";
-    static wxString Fields(const wxString& key) { return logtest::LogFields(key); }
+    static wxString Fields(const wxString& key) { return logtest::LogLine(key, "").BeforeLast('\t'); }
     // What a log view shows: every record handed over through its cursor.
     static void Take(const Model& model, std::uint64_t& cursor, std::vector<JobRecord>& shown)
     {
