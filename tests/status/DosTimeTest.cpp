@@ -39,12 +39,7 @@ wxString Dos(unsigned year, unsigned month, unsigned day, unsigned hour, unsigne
 
 wyxos::LocaleTimeInfo PatternInfo(const char* date, const char* time)
 {
-    wyxos::LocaleTimeInfo info;
-    info.hasDatePattern = info.hasTimePattern = true;
-    info.datePattern = date;
-    info.timePattern = time;
-    info.names = kEnglish;
-    return info;
+    return {true, date, true, time, kEnglish};
 }
 
 // Kind (D or T), the hour, the pattern and after '=' what it gives at 15 March
@@ -145,14 +140,10 @@ TEST(StrftimeConversion, GivesTheWindowsLettersOrRefuses)
 // strftime's %x or %X in a locale: the reference our walker must meet.
 wxString CLibraryFormat(locale_t locale, const char* format, const CalendarFields& f)
 {
-    std::tm tm{};
-    tm.tm_year = static_cast<int>(f.year) - 1900;
-    tm.tm_mon = static_cast<int>(f.month) - 1;
-    tm.tm_mday = static_cast<int>(f.day);
-    tm.tm_wday = static_cast<int>(f.weekDay);
-    tm.tm_hour = static_cast<int>(f.hour);
-    tm.tm_min = static_cast<int>(f.minute);
-    tm.tm_sec = static_cast<int>(f.second);
+    std::tm tm{}; // the C library works out the week day
+    const wxString text =
+        wxString::Format("%u-%u-%u %u:%u:%u", f.year, f.month, f.day, f.hour, f.minute, f.second);
+    EXPECT_NE(strptime(text.c_str(), "%Y-%m-%d %H:%M:%S", &tm), nullptr);
     char buffer[256];
     const size_t length = strftime_l(buffer, sizeof buffer, format, &tm, locale);
     return wxString(buffer, wxCSConv(nl_langinfo_l(CODESET, locale)), length);
@@ -178,13 +169,9 @@ TEST(LocaleReference, DateAndTimeEqualTheCLibrarysFormats)
         {
             const unsigned hours[] = {0, 1, 9, 11, 12, 13, 23};
             const wxDateTime day(1 + i * 2, static_cast<wxDateTime::Month>(i), 2000 + i * 9);
-            const CalendarFields fields{static_cast<unsigned>(day.GetYear()),
-                                        i + 1,
-                                        day.GetDay(),
-                                        static_cast<unsigned>(day.GetWeekDay()),
-                                        hours[i % 7],
-                                        i * 5 + 1,
-                                        58 - i * 4};
+            const unsigned year = day.GetYear(), weekDay = day.GetWeekDay();
+            const CalendarFields fields{year,         i + 1,     day.GetDay(), weekDay,
+                                        hours[i % 7], i * 5 + 1, 58 - i * 4};
             EXPECT_EQ(FormatLocaleDate(fields, info), CLibraryFormat(reference, "%x", fields))
                 << info.datePattern;
             EXPECT_EQ(FormatLocaleTime(fields, info), CLibraryFormat(reference, "%X", fields))

@@ -6,11 +6,11 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include <atomic>
+#include <chrono>
 #include <functional>
+#include <future>
 #include <memory>
 #include <set>
-#include <thread>
 
 #include <wx/filename.h>
 
@@ -28,6 +28,7 @@ namespace
 {
 
 const auto* const kWx = testing::AddGlobalTestEnvironment(new statustest::WxEnvironment);
+using Records = std::vector<JobRecord>;
 
 struct StatusModelKind
 {
@@ -35,11 +36,7 @@ struct StatusModelKind
     static constexpr const char* kJournal = "TiveraJobsStatusFile";
     static wxString Fields(const wxString& key) { return statustest::StatusLine(key, "").BeforeLast('\t'); }
     // What a view shows: the status model's latest read.
-    static void Take(const Model& model, std::uint64_t&, std::vector<JobRecord>& shown)
-    {
-        shown.clear();
-        model.GetJobs(shown);
-    }
+    static void Take(const Model& model, std::uint64_t&, Records& out) { model.GetJobs(out = {}); }
 };
 
 struct LogModelKind
@@ -48,16 +45,12 @@ struct LogModelKind
     static constexpr const char* kJournal = "TiveraJobsLogFile";
     static wxString Fields(const wxString& key) { return logtest::LogLine(key, "").BeforeLast('\t'); }
     // What a log view shows: every record handed over through its cursor.
-    static void Take(const Model& model, std::uint64_t& cursor, std::vector<JobRecord>& shown)
-    {
-        model.GetRecordsSince(cursor, shown);
-    }
+    static void Take(const Model& model, std::uint64_t& at, Records& out) { model.GetRecordsSince(at, out); }
 };
 
 // Reads the journal file, but answers `failWith` for the next `failures` reads.
-class FailingReader : public wyx::JobsFileReadWriter
+struct FailingReader : wyx::JobsFileReadWriter
 {
-public:
     explicit FailingReader(const wxString& path) { SetPath(path); }
     int ReadJobs(wxArrayString& lines) override
     {
@@ -83,11 +76,7 @@ protected:
         for (const wxEventType type :
              {wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBLOG, wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS})
             m_handler.Bind(wxEventTypeTag<wxCommandEvent>(type),
-                           [this](wxCommandEvent& event)
-                           {
-                               ++m_updates;
-                               m_lastId = event.GetId();
-                           });
+                           [this](wxCommandEvent& event) { m_ids.push_back(event.GetId()); });
         EventBus::Get().Subscribe(ChannelKey(1), &m_handler);
         EventBus::Get().Subscribe(ChannelKey(2), &m_handler);
     }
@@ -112,7 +101,7 @@ protected:
     wxString Keys(const Model& model, std::size_t field = 0) const
     {
         std::uint64_t cursor = 0;
-        std::vector<JobRecord> shown;
+        Records shown;
         Kind::Take(model, cursor, shown);
         wxString keys;
         for (const JobRecord& record : shown)
@@ -122,13 +111,12 @@ protected:
     int Updates()
     {
         wxAppConsole::GetInstance()->ProcessPendingEvents();
-        return m_updates;
+        return static_cast<int>(m_ids.size());
     }
     statustest::SystemRoot m_root;
     Model m_model{Journal()};
     wxEvtHandler m_handler;
-    int m_updates = 0;
-    int m_lastId = -1;
+    std::vector<int> m_ids; // of each update published
 };
 
 using ModelKinds = testing::Types<StatusModelKind, LogModelKind>;
@@ -239,37 +227,31 @@ TYPED_TEST(JournalPoll, PollerProducerAndViewTogetherLoseAndRepeatNothing)
 {
     constexpr int kJobs = 100;
     this->Write({});
-    std::atomic<bool> producing{true};
-    std::atomic<bool> polling{true};
-    std::thread producer(
-        [&]
-        {
-            wyx::JobsFileReadWriter journal;
-            journal.SetPath(this->Journal());
-            for (int i = 0; i < kJobs; ++i)
-            {
-                wxString fields = TypeParam::Fields(wxString::Format("job-%d", i));
-                EXPECT_EQ(journal.AddJob(fields), wyx::JobOk);
-            }
-            producing = false;
-        });
-    std::thread poller(
-        [&]
-        {
-            while (producing)
-                this->m_model.Refresh();
-            this->m_model.Refresh();
-            polling = false;
-        });
+    const auto running = [](const std::future<void>& task)
+    { return task.wait_for(std::chrono::milliseconds(1)) != std::future_status::ready; };
+    const std::future<void> producer =
+        std::async(std::launch::async,
+                   [&]
+                   {
+                       wyx::JobsFileReadWriter journal;
+                       journal.SetPath(this->Journal());
+                       for (int i = 0; i < kJobs; ++i)
+                       {
+                           wxString fields = TypeParam::Fields(wxString::Format("job-%d", i));
+                           EXPECT_EQ(journal.AddJob(fields), wyx::JobOk);
+                       }
+                   });
+    const std::future<void> poller = std::async(std::launch::async,
+                                                [&]
+                                                {
+                                                    while (running(producer))
+                                                        this->m_model.Refresh();
+                                                    this->m_model.Refresh();
+                                                });
     std::uint64_t cursor = 0;
-    std::vector<JobRecord> shown;
-    while (polling)
-    {
+    Records shown;
+    while (running(poller))
         TypeParam::Take(this->m_model, cursor, shown);
-        std::this_thread::yield();
-    }
-    producer.join();
-    poller.join();
     TypeParam::Take(this->m_model, cursor, shown);
 
     std::set<wxString> keys;
@@ -313,13 +295,13 @@ TEST_F(StatusModel, KeepsJournalOrderShowsOnlyWholeLinesOfLiveJobsAndPublishesEa
     EXPECT_EQ(m_model.Refresh(), 1);
     EXPECT_EQ(m_model.Refresh(), 0);
     EXPECT_EQ(Updates(), 3);
-    EXPECT_EQ(m_lastId, 0);
+    EXPECT_EQ(m_ids.back(), 0);
     EXPECT_EQ(Keys(m_model), "");
 }
 
 // Stopped, a free lock is still taken; the read stops at once and keeps what
 // it has, and the journal counts as not yet read.
-TEST_F(StatusModel, WhileStoppedAFreeLockIsTakenAndTheCutReadIsReadWholeLater)
+TEST_F(StatusModel, WhileStoppedAFreeLockIsTakenTheCutReadIsReadWholeLaterAndOldReadsAreFreed)
 {
     Write({"1"});
     ASSERT_EQ(m_model.Refresh(), 1);
@@ -331,16 +313,12 @@ TEST_F(StatusModel, WhileStoppedAFreeLockIsTakenAndTheCutReadIsReadWholeLater)
     EXPECT_EQ(m_model.Refresh(), 1);
     EXPECT_EQ(Keys(m_model, StatusField::Status), "Saving...|Sent|");
     EXPECT_EQ(Updates(), 3);
-}
 
-TEST_F(StatusModel, AReadNoViewShowsAnyMoreIsFreedAtTheNextPollEvenWithoutAChange)
-{
-    Write({"1"});
-    ASSERT_EQ(m_model.Refresh(), 1);
+    // A read no view shows any more is freed at the next poll, even without a change.
     std::weak_ptr<const JobSnapshot> first = m_model.GetSnapshot();
     {
         const std::shared_ptr<const JobSnapshot> shown = m_model.GetSnapshot(); // as a view holds it
-        Write({"2"});
+        Write({"3"});
         ASSERT_EQ(m_model.Refresh(), 1);
         EXPECT_EQ(m_model.Refresh(), 0);
         EXPECT_FALSE(first.expired()) << "still shown";

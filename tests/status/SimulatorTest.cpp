@@ -34,13 +34,8 @@ std::vector<wxArrayString> ReadJournal(const wxString& path)
 TEST(Simulator, WritesWellFormedTrafficThatTheModelsRead)
 {
     statustest::SystemRoot root;
-    SimulatorOptions options;
-    options.jobsPerSecond = 200;
-    options.durationSeconds = 0.05;
-    options.stepSeconds = 0.005;
-    options.failureShare = 0.5;
-    options.seedGiven = true;
-    options.hotFolderRoot = root.Path() + "/srv/hotfolders";
+    // 200 jobs a second for 0.05 s, half failing, 0.005 s in each stage, from a fixed seed.
+    const SimulatorOptions options{200, 0.05, 0.5, 0.005, 0, true, "", root.Path() + "/srv/hotfolders"};
     HotFolderSimulator simulator(options, [] { return false; });
     wxString problem;
     ASSERT_TRUE(simulator.Prepare(problem)) << problem;
