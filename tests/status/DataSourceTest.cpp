@@ -2,7 +2,7 @@
 
 #include <sys/stat.h>
 
-#include <cstring>
+#include <fstream>
 
 #include "SystemRoot.h"
 #include "platform/datasource/WyxDataSource.h"
@@ -19,11 +19,10 @@ TEST(DataSource, ReadsEachSectionOfTheFileAnewAtEachCallLineByLineAndWaitsOnNoFi
     const wxString ini = GetDataDirectory() + "HotFolders.ini";
     const auto lists = [] // what the data source gives, "stale" entries left in the arrays would show
     {
-        wxArrayString hotFolders(1, "stale");
-        wxArrayString servers(1, "stale");
-        const long folderCount = WyxDataSource::GetInstance().GetHotFoldersList(hotFolders);
-        const long serverCount = WyxDataSource::GetInstance().GetServersList(servers);
-        EXPECT_EQ(folderCount + serverCount, static_cast<long>(hotFolders.size() + servers.size()));
+        wxArrayString hotFolders(1, "stale"), servers(1, "stale");
+        WyxDataSource& source = WyxDataSource::GetInstance();
+        const long count = source.GetHotFoldersList(hotFolders) + source.GetServersList(servers);
+        EXPECT_EQ(count, static_cast<long>(hotFolders.size() + servers.size()));
         return wxJoin(hotFolders, '|', 0) + " " + wxJoin(servers, '|', 0);
     };
     EXPECT_EQ(lists(), " ") << "no file";
@@ -40,9 +39,7 @@ TEST(DataSource, ReadsEachSectionOfTheFileAnewAtEachCallLineByLineAndWaitsOnNoFi
               "/srv/Z\xC3\xBCrich|/srv/M\xC3\xBCnchen PRN-1"},
              {"[Servers\nA\n", " "}})
     {
-        wxFFile file(ini, "wb");
-        ASSERT_EQ(file.Write(text, std::strlen(text)), std::strlen(text));
-        file.Close();
+        std::ofstream(ini.utf8_string(), std::ios::binary) << text;
         EXPECT_EQ(lists(), wxString::FromUTF8(expected)) << text;
     }
     wxRemoveFile(ini);

@@ -344,9 +344,8 @@ TEST(JournalWatchRules, TellOfABusyJournalAfterAFewPollsAndOfAnUnreadableOneAtOn
                               : poll[0] == 'b' ? watch.NoteBusy(now)
                                                : watch.NoteUnreadable(now);
             const JournalWatch::Report report = watch.Get();
-            EXPECT_EQ(wxString(told ? "!" : "-") + "RBU"[static_cast<int>(report.state)] +
-                          wxString::Format("%d", static_cast<int>(report.since)) +
-                          (report.recovered ? "+" : ""),
+            EXPECT_EQ(wxString::Format("%c%c%d%s", told ? '!' : '-', "RBU"[static_cast<int>(report.state)],
+                                       static_cast<int>(report.since), report.recovered ? "+" : ""),
                       poll.Mid(1));
         }
     }
