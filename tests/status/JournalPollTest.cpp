@@ -27,7 +27,7 @@
 namespace
 {
 
-const auto* const kWx = testing::AddGlobalTestEnvironment(new statustest::WxEnvironment);
+const auto* const kWx = testing::AddGlobalTestEnvironment(new wyxtest::WxEnvironment);
 using Records = std::vector<JobRecord>;
 
 struct StatusModelKind
@@ -82,19 +82,12 @@ protected:
     }
     ~JournalPoll() override { EventBus::Get().Unsubscribe(&m_handler); }
     wxString Journal() const { return GetDataDirectory() + Kind::kJournal + ".txt"; }
-    // Writes one ADDED line for each key.
-    void Write(std::initializer_list<wxString> keys)
-    {
-        std::vector<wxString> lines;
-        for (const wxString& key : keys)
-            lines.push_back(Kind::Fields(key) + "\tADDED");
-        WriteLines(lines);
-    }
-    void WriteLines(const std::vector<wxString>& lines)
+    // Writes one line for each key, the key's fields and the tag; with no tag, the lines as given.
+    void Write(std::initializer_list<wxString> keys, const wxString& tag = "ADDED")
     {
         wxString text;
-        for (const wxString& line : lines)
-            text += line + "\r\n";
+        for (const wxString& key : keys)
+            text += (tag.empty() ? key : Kind::Fields(key) + "\t" + tag) + "\r\n";
         wyxtest::SystemRoot::WriteFile(Journal(), text);
     }
     // The field of each record shown, each followed by '|'.
@@ -265,17 +258,18 @@ TYPED_TEST(JournalPoll, PollerProducerAndViewTogetherLoseAndRepeatNothing)
 using StatusModel = JournalPoll<StatusModelKind>;
 
 // Shown are whole lines of nine pieces (empty ones do not count) of live jobs, in journal order.
-TEST_F(StatusModel, KeepsJournalOrderShowsOnlyWholeLinesOfLiveJobsAndPublishesEachNewList)
+TEST_F(StatusModel, ShowsWholeLinesOfLiveJobsInJournalOrderReadsWholeOnlyWhenRunningAndFreesOldReads)
 {
     using statustest::StatusLine;
     const wxString k7 =
         "K7\t/hf/In\t/hf/In/report final.ps\tPRN-02\t1383035055\tTransferring to server\tN/A\t"
         "PostScript\tadded";
-    WriteLines({StatusLine("3", "ADDED"), "", StatusLine("4", "COMMIT"), "ADDED", "\t\t\t",
-                "5\t/hf\t/hf/a.pdf\tPRN\t1383035055\tSaving...\t\tPDF\tADDED",
-                "6\t/hf\t/hf/a.pdf\tPRN\t1383035055\tSaving...\tPDF\tADDED", StatusLine("7", "extra\tADDED"),
-                StatusLine("8", "ADDED2"), StatusLine("1", "modified"), StatusLine("2", "MODIFIED"),
-                "\t\t" + StatusLine("9", "ADDED") + "\t", StatusLine(" ", "ADDED"), k7});
+    Write({StatusLine("3", "ADDED"), "", StatusLine("4", "COMMIT"), "ADDED", "\t\t\t",
+           "5\t/hf\t/hf/a.pdf\tPRN\t1383035055\tSaving...\t\tPDF\tADDED",
+           "6\t/hf\t/hf/a.pdf\tPRN\t1383035055\tSaving...\tPDF\tADDED", StatusLine("7", "extra\tADDED"),
+           StatusLine("8", "ADDED2"), StatusLine("1", "modified"), StatusLine("2", "MODIFIED"),
+           "\t\t" + StatusLine("9", "ADDED") + "\t", StatusLine(" ", "ADDED"), k7},
+          "");
     EXPECT_EQ(m_model.Refresh(), 1);
     EXPECT_EQ(Keys(m_model), "3|1|2|9| |K7|");
     JobRecord record;
@@ -291,28 +285,25 @@ TEST_F(StatusModel, KeepsJournalOrderShowsOnlyWholeLinesOfLiveJobsAndPublishesEa
     ASSERT_TRUE(file.SetTimes(nullptr, &later, nullptr));
     EXPECT_EQ(m_model.Refresh(), 1);
     // Only committed jobs left: the list empties, published once.
-    WriteLines({StatusLine("1", "COMMIT"), StatusLine("2", "COMMIT")});
+    Write({"1", "2"}, "COMMIT");
     EXPECT_EQ(m_model.Refresh(), 1);
     EXPECT_EQ(m_model.Refresh(), 0);
     EXPECT_EQ(Updates(), 3);
     EXPECT_EQ(m_ids.back(), 0);
     EXPECT_EQ(Keys(m_model), "");
-}
 
-// Stopped, a free lock is still taken; the read stops at once and keeps what
-// it has, and the journal counts as not yet read.
-TEST_F(StatusModel, WhileStoppedAFreeLockIsTakenTheCutReadIsReadWholeLaterAndOldReadsAreFreed)
-{
+    // Stopped, a free lock is still taken; the read stops at once and keeps what
+    // it has, and the journal counts as not yet read.
     Write({"1"});
     ASSERT_EQ(m_model.Refresh(), 1);
     m_model.SetRunning(false);
-    WriteLines({statustest::StatusLine("1", "ADDED"), statustest::StatusLine("2", "ADDED", "Sent")});
+    Write({statustest::StatusLine("1", "ADDED"), statustest::StatusLine("2", "ADDED", "Sent")}, "");
     EXPECT_EQ(m_model.Refresh(), 1);
     EXPECT_EQ(Keys(m_model), "");
     m_model.SetRunning(true);
     EXPECT_EQ(m_model.Refresh(), 1);
     EXPECT_EQ(Keys(m_model, StatusField::Status), "Saving...|Sent|");
-    EXPECT_EQ(Updates(), 3);
+    EXPECT_EQ(Updates(), 6);
 
     // A read no view shows any more is freed at the next poll, even without a change.
     std::weak_ptr<const JobSnapshot> first = m_model.GetSnapshot();

@@ -11,7 +11,7 @@
 namespace
 {
 
-const auto* const kWx = testing::AddGlobalTestEnvironment(new statustest::WxEnvironment);
+const auto* const kWx = testing::AddGlobalTestEnvironment(new wyxtest::WxEnvironment);
 
 // Half the jobs fail: each failed one marks its hot folder, and every job
 // finished removes its line from the status journal again.

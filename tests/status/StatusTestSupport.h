@@ -10,8 +10,6 @@
 namespace statustest
 {
 
-using wyxtest::WxEnvironment;
-
 class SystemRoot : public wyxtest::SystemRoot
 {
 public:
