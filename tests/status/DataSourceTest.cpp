@@ -13,7 +13,7 @@ namespace
 // The instance reads the file below WYX_SYSTEM_ROOT at every call; each file
 // text (raw bytes: a stray one costs only its own line) gives the hot folders
 // and the servers, each list joined by '|'.
-TEST(DataSource, ReadsEachSectionOfTheFileAnewAtEachCallLineByLineAndWaitsOnNoFifo)
+TEST(DataSource, ReadsEachSectionAnewAtEachCallLineByLineWaitsOnNoFifoAndLogsEachIconChange)
 {
     wyxtest::SystemRoot root;
     const wxString ini = GetDataDirectory() + "HotFolders.ini";
@@ -45,12 +45,9 @@ TEST(DataSource, ReadsEachSectionOfTheFileAnewAtEachCallLineByLineAndWaitsOnNoFi
     wxRemoveFile(ini);
     ASSERT_EQ(::mkfifo(ini.utf8_str(), 0666), 0);
     EXPECT_EQ(lists(), " ");
-}
 
-// What is kept in memory is checked with the folder errors that cause it.
-TEST(DataSource, RecordsEachIconChangeInTheLogEvenWithoutADataFolder)
-{
-    wyxtest::SystemRoot root;
+    // Each icon change is logged, and still recorded without a data folder; what is kept
+    // in memory is checked with the folder errors that cause it.
     WyxDataSource& source = WyxDataSource::GetInstance();
     EXPECT_EQ(source.ChangeHotfolderIcon("/srv/a", false), 0);
     EXPECT_EQ(source.ChangeHotfolderIcon("/srv/b b", true), 0);

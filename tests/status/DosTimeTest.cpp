@@ -16,6 +16,9 @@
 namespace
 {
 
+using wyxos::ConvertStrftimePattern;
+using wyxos::PatternKind;
+
 const wyxos::LocaleNames kEnglish{
     {"January", "February", "March", "April", "May", "June", "July", "August", "September", "October",
      "November", "December"},
@@ -112,18 +115,17 @@ TEST(StrftimeConversion, GivesTheWindowsLettersOrRefuses)
                  '|'))
     {
         const wxString expected = c.AfterFirst('=');
+        const PatternKind kind = c[0] == 'D' ? PatternKind::Date : PatternKind::Time;
         wxString pattern = "untouched";
-        EXPECT_EQ(wyxos::ConvertStrftimePattern(
-                      c.Mid(1).BeforeFirst('='),
-                      c[0] == 'D' ? wyxos::PatternKind::Date : wyxos::PatternKind::Time, "%p %I:%M", pattern),
+        EXPECT_EQ(ConvertStrftimePattern(c.Mid(1).BeforeFirst('='), kind, "%p %I:%M", pattern),
                   !expected.empty())
             << c;
         EXPECT_EQ(pattern, expected.empty() ? "untouched" : expected) << c;
     }
     // The am/pm composite needs the locale's format, and one naming itself is not expanded for ever.
     wxString pattern;
-    EXPECT_FALSE(wyxos::ConvertStrftimePattern("%r", wyxos::PatternKind::Time, "", pattern));
-    EXPECT_FALSE(wyxos::ConvertStrftimePattern("%r", wyxos::PatternKind::Time, "%r", pattern));
+    EXPECT_FALSE(ConvertStrftimePattern("%r", PatternKind::Time, "", pattern));
+    EXPECT_FALSE(ConvertStrftimePattern("%r", PatternKind::Time, "%r", pattern));
 }
 
 // strftime's %x or %X in a locale: the reference our walker must meet.

@@ -10,9 +10,8 @@
 namespace statustest
 {
 
-class SystemRoot : public wyxtest::SystemRoot
+struct SystemRoot : wyxtest::SystemRoot
 {
-public:
     wxString JournalPath() const { return GetDataDirectory() + "TiveraJobsStatusFile.txt"; }
 };
 
