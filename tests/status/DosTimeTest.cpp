@@ -58,11 +58,8 @@ TEST(PatternWalk, ProducesTheDocumentedItems)
              '|'))
     {
         const CalendarFields moment = Moment(std::stoul(walk.Mid(1, 2).ToStdString()));
-        const wxString pattern = walk.Mid(3).BeforeFirst('=');
-        EXPECT_EQ(walk[0] == 'D' ? WalkDatePattern(pattern, moment, kEnglish)
-                                 : WalkTimePattern(pattern, moment, kEnglish),
-                  walk.AfterFirst('='))
-            << walk;
+        const auto walker = walk[0] == 'D' ? WalkDatePattern : WalkTimePattern;
+        EXPECT_EQ(walker(walk.Mid(3).BeforeFirst('='), moment, kEnglish), walk.AfterFirst('=')) << walk;
     }
 }
 
@@ -73,8 +70,7 @@ TEST(FormatDosTime, SplitsTheValueIntoLocalDateAndTimeOfRealMomentsOnlyFallingBa
     EXPECT_EQ(FormatDosTime(text, info), "15/03/21, 14:05:30");
     EXPECT_EQ(FormatDosTime(text, PatternInfo("M/d/yy", "h:mm:ss tt")), "3/15/21, 2:05:30 PM");
     EXPECT_EQ(FormatDosTime(text, PatternInfo("dddd", "h tt")), "Monday, 2 PM");
-    EXPECT_EQ(FormatDosTime(text + "\tjunk 7", info), "15/03/21, 14:05:30")
-        << "only the leading digits count";
+    EXPECT_EQ(FormatDosTime(text + "\tjunk 7", info), "15/03/21, 14:05:30"); // only the leading digits count
     EXPECT_EQ(FormatDosTime(Dos(2020, 2, 29, 23, 59, 58), info), "29/02/20, 23:59:58");
     EXPECT_EQ(FormatDosTime(Dos(2107, 12, 31, 0, 0, 0), info), "31/12/07, 00:00:00");
     for (const wxString& none :
@@ -92,13 +88,10 @@ TEST(FormatDosTime, SplitsTheValueIntoLocalDateAndTimeOfRealMomentsOnlyFallingBa
     // The library's %x and %X where a pattern fails; the user's locale by default.
     const wxDateTime moment(15, wxDateTime::Mar, 2021, 14, 5, 30);
     for (const wyxos::LocaleTimeInfo& failing : {wyxos::LocaleTimeInfo(), PatternInfo("yyy", "ttt")})
-    {
-        EXPECT_EQ(FormatLocaleDate(Moment(14), failing), moment.Format("%x"));
-        EXPECT_EQ(FormatLocaleTime(Moment(14), failing), moment.Format("%X"));
-    }
+        EXPECT_EQ(FormatLocaleDate(Moment(14), failing) + FormatLocaleTime(Moment(14), failing),
+                  moment.Format("%x%X"));
     EXPECT_EQ(FormatLocaleDate(wxDateTime()), "");
-    EXPECT_EQ(FormatDosTime(Dos(2021, 3, 15, 14, 5, 30)),
-              FormatLocaleDate(moment) + ", " + FormatLocaleTime(moment));
+    EXPECT_EQ(FormatDosTime(text), FormatLocaleDate(moment) + ", " + FormatLocaleTime(moment));
 }
 
 // Kind (D or T), the C library's format, and after '=' our pattern, or nothing

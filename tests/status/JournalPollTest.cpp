@@ -55,10 +55,7 @@ struct FailingReader : wyx::JobsFileReadWriter
     int ReadJobs(wxArrayString& lines) override
     {
         ++reads;
-        if (failures == 0)
-            return wyx::JobsFileReadWriter::ReadJobs(lines);
-        --failures;
-        return failWith;
+        return failures-- > 0 ? failWith : wyx::JobsFileReadWriter::ReadJobs(lines);
     }
     int failWith = wyx::JobLockFailed;
     int failures = 0;
@@ -77,8 +74,8 @@ protected:
              {wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBLOG, wxEVT_MY_CUSTOM_COMMAND_UPDATEJOBSTATUS})
             m_handler.Bind(wxEventTypeTag<wxCommandEvent>(type),
                            [this](wxCommandEvent& event) { m_ids.push_back(event.GetId()); });
-        EventBus::Get().Subscribe(ChannelKey(1), &m_handler);
-        EventBus::Get().Subscribe(ChannelKey(2), &m_handler);
+        for (const int channel : {1, 2})
+            EventBus::Get().Subscribe(ChannelKey(channel), &m_handler);
     }
     ~JournalPoll() override { EventBus::Get().Unsubscribe(&m_handler); }
     wxString Journal() const { return GetDataDirectory() + Kind::kJournal + ".txt"; }
@@ -150,9 +147,8 @@ TYPED_TEST(JournalPoll, AnIdlePollLeavesTheLockAloneAndAHeldLockMakesAChangedJou
 
 TYPED_TEST(JournalPoll, AFailedReadKeepsDataAndStampUnlessTheJournalIsUnreadable)
 {
-    auto owned = std::make_unique<FailingReader>(this->Journal());
-    FailingReader& reader = *owned;
-    typename TypeParam::Model model(this->Journal(), std::move(owned));
+    FailingReader& reader = *new FailingReader(this->Journal()); // owned by the model
+    typename TypeParam::Model model(this->Journal(), std::unique_ptr<FailingReader>(&reader));
     this->Write({"1"});
     ASSERT_EQ(model.Parse(), 1);
 
