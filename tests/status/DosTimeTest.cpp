@@ -61,6 +61,8 @@ TEST(PatternWalk, ProducesTheDocumentedItems)
         const auto walker = walk[0] == 'D' ? WalkDatePattern : WalkTimePattern;
         EXPECT_EQ(walker(walk.Mid(3).BeforeFirst('='), moment, kEnglish), walk.AfterFirst('=')) << walk;
     }
+    // A locale without am/pm names: the designator is left out, not read past its end.
+    EXPECT_EQ(WalkTimePattern("h:mm t", Moment(14), wyxos::LocaleNames()), "2:05 ");
 }
 
 TEST(FormatDosTime, SplitsTheValueIntoLocalDateAndTimeOfRealMomentsOnlyFallingBackToTheLibrary)

@@ -23,8 +23,7 @@ TEST(Simulator, WritesWellFormedTrafficThatTheModelsRead)
     HotFolderSimulator simulator(options, [] { return false; });
     wxString problem;
     ASSERT_TRUE(simulator.Prepare(problem)) << problem;
-    const wxString statusJournal = simulator.DataDirectory() + "TiveraJobsStatusFile.txt";
-    JobStatusManager status(statusJournal);
+    JobStatusManager status(root.JournalPath()); // the program's data directory, as the simulator's
     const wxString logJournal = simulator.DataDirectory() + "TiveraJobsLogFile.txt";
     statustest::SystemRoot::WriteFile(logJournal, "");
     JobLogManager log(logJournal);
@@ -32,7 +31,7 @@ TEST(Simulator, WritesWellFormedTrafficThatTheModelsRead)
     const HotFolderSimulator::Totals totals = simulator.Run();
     EXPECT_TRUE(totals.failed > 0 && totals.succeeded > 0 && totals.journalErrors == 0);
     EXPECT_EQ(totals.started, totals.succeeded + totals.failed);
-    EXPECT_EQ(wxFileName::GetSize(statusJournal), 0);
+    EXPECT_EQ(wxFileName::GetSize(root.JournalPath()), 0);
 
     // After the first read the log model takes in only whole ADDED lines of new keys: every
     // finished job is logged so, in a hot folder the data source names.
