@@ -37,7 +37,7 @@ TEST(LogModelBesideAProducerProcess, ListsEveryJobExactlyOnceAcrossTrimming)
     const std::string command =
         wxString::Format("'%s' log add - < '%s'", WYX_JOURNAL_TOOL, input).utf8_string();
     auto producer = std::async(std::launch::async, [&] { return std::system(command.c_str()); });
-    // The polling thread's part, driven here until the producer is done.
+    // What the polling thread does, driven here until the producer is done.
     while (producer.wait_for(std::chrono::seconds(0)) != std::future_status::ready)
         model.Parse();
     ASSERT_EQ(0, producer.get());
