@@ -22,7 +22,12 @@ namespace
 
 // The pump needs the library's thread module and an application object for its
 // pending-event queues; a console application is enough.
-const wxInitializer initialized;
+struct WxBaseEnvironment : ::testing::Environment
+{
+    void SetUp() override { ASSERT_TRUE(wxInitialize()); }
+    void TearDown() override { wxUninitialize(); }
+};
+const auto* const registered = ::testing::AddGlobalTestEnvironment(new WxBaseEnvironment);
 
 template <typename Done> void WaitUntil(Done done)
 {
@@ -204,4 +209,23 @@ TEST(EventBus, EachLiveSubscriptionGetsAQueuedCopyUntilItsHandlerLeaves)
     }
     publishing = false;
     publisher.join();
+}
+
+// Listeners added and removed while passes run at a millisecond's interval,
+// then a stop: a thread the stop does not join is still ending when its
+// object goes, which the library's end of the process trips over.
+TEST(PollingThread, ListenersComeAndGoWhilePassesRun)
+{
+    Listener listener, visitor;
+    ServerEventListner registry;
+    registry.SetPollingInterval(1);
+    registry.AddListener("OnNewData", &listener);
+    ASSERT_TRUE(registry.StartTimer());
+    for (int round = 0; round < 2000; ++round)
+    {
+        EXPECT_TRUE(registry.AddListener("Visitor", &visitor));
+        EXPECT_EQ(registry.RemoveListener("Visitor"), &visitor);
+    }
+    WaitUntil([&, until = listener.calls + 2] { return listener.calls >= until; });
+    EXPECT_TRUE(registry.StopTimer());
 }
