@@ -157,6 +157,13 @@ TEST_F(ListInput, SingleSelectionKeysAndWheel)
     Run("key up|*|0 @0; key pgdn|*|p-1 ^0; key pgdn|*|2p-2 ^p-1; key pgup|*|p-1 ^p-1; key end|*|199 ^$;");
     Run("key down|*|199; key home|*|0 ^0; clear 0|*|; wheel -120||^3; wheel -60||^3; wheel -60||^6;");
     Run("wheel 1200||^0; wheel -30000||^$;");
+    // A wheel event a program sends without a delta counts in notches of 120, as the toolkit's do.
+    wxMouseEvent wheel(wxEVT_MOUSEWHEEL);
+    wheel.m_wheelRotation = 120;
+    wheel.m_linesPerAction = 3;
+    const long bottom = m_rows->GetTopItem();
+    m_rows->ProcessWindowEvent(wheel);
+    EXPECT_EQ(m_rows->GetTopItem(), bottom - 3);
 }
 
 TEST_F(ListInput, MultipleSelectionByMouseAndKeys)
@@ -173,7 +180,8 @@ TEST_F(ListInput, VirtualListsKeepTheSelectionInsideTheCountAndChangeManyRowsInO
 {
     Build(wxLC_VIRTUAL, 10);
     Run("focus 7|F7 S7|7 @7; select 2|S2|2 7; count 5||2 @4; count 10||2; count 0||@-1; count 100000||;"
-        "key c+a|K-1 S-1|#100000; click 3|D-1 F3|3; key s+end|*|#99997 ^$;");
+        "key c+a|K-1 S-1|#100000; click 3|D-1 F3|3; key s+end|*|#99997 ^$; key c+a|*|#100000;"
+        "top 0||#100000; click s+5|*|#3;");
 }
 
 TEST_F(ListInput, RowsKeepTheirSelectionTextsAndDataThroughInsertsAndDeletes)
@@ -184,6 +192,16 @@ TEST_F(ListInput, RowsKeepTheirSelectionTextsAndDataThroughInsertsAndDeletes)
     EXPECT_TRUE(m_list->DeleteItem(2) && m_list->SetItemData(0, 42));
     EXPECT_EQ(m_list->InsertItem(99, wxS("appended")), 6) << "an index past the end appends";
     Run("select 0|S0|0 3 @3;");
+    EXPECT_EQ(m_list->GetNextItem(3, wxLIST_NEXT_ABOVE, wxLIST_STATE_SELECTED), 0);
+    EXPECT_EQ(m_list->GetNextItem(3, wxLIST_NEXT_ABOVE, wxLIST_STATE_DONTCARE), 2);
+    // Fitted to the widest text with some room; row 0 names an image, but without an image list
+    // there is none to make room for.
+    m_list->SetColumnWidth(0, wxLIST_AUTOSIZE);
+    const int widest = m_rows->GetTextExtent(wxS("new first")).GetWidth();
+    EXPECT_GT(m_list->GetColumnWidth(0), widest);
+    EXPECT_LT(m_list->GetColumnWidth(0), widest + 32);
+    m_list->SetBackgroundColour(*wxCYAN);
+    EXPECT_EQ(m_rows->GetBackgroundColour(), *wxCYAN) << "the rows window takes the list's background";
     EXPECT_EQ(m_list->GetItemText(3) + m_list->GetItemText(6) +
                   wxString::Format("%d", int(m_list->GetItemData(0))),
               wxS("row 3appended42"));

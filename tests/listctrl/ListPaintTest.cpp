@@ -137,9 +137,9 @@ bool TakeRepaintRequest(wxWindow* window)
     return requested != nullptr;
 }
 
-TEST_F(ListPaint, HeaderIsRepaintedForANewTitleOrWidth)
+TEST_F(ListPaint, HeaderIsRepaintedForANewTitleOrWidthAndRowsWhenManyLoseTheirSelection)
 {
-    auto* list = MakeRows(0, {100, 100}, 1);
+    auto* list = MakeRows(0, {100, 100}, 300);
     ASSERT_TRUE(guitest::PumpUntil([list] { return !list->GetMainWindow()->IsDirty(); }));
     ProfilesKelvoListHeaderWindow* header = list->GetHeaderWindow();
     TakeRepaintRequest(header);
@@ -150,6 +150,16 @@ TEST_F(ListPaint, HeaderIsRepaintedForANewTitleOrWidth)
     EXPECT_TRUE(TakeRepaintRequest(header)) << "title";
     list->SetColumnWidth(0, 160);
     EXPECT_TRUE(TakeRepaintRequest(header)) << "width";
+    // A click on one row of all selected takes the selection from the others in one step.
+    ProfilesKelvoListMainWindow* rows = list->GetMainWindow();
+    rows->SetAllSelected(true);
+    ASSERT_TRUE(guitest::PumpUntil([rows] { return !TakeRepaintRequest(rows); }));
+    wxMouseEvent click(wxEVT_LEFT_DOWN);
+    click.SetPosition(wxPoint(50, rows->GetLineHeight() / 2));
+    click.SetLeftDown(true);
+    rows->ProcessWindowEvent(click);
+    EXPECT_EQ(list->GetSelectedItemCount(), 1);
+    EXPECT_TRUE(TakeRepaintRequest(rows)) << "the rows that lost their selection";
 }
 // ---------------------------------------------------------------- job table
 
