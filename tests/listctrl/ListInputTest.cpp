@@ -210,8 +210,18 @@ TEST_F(ListInput, RowsKeepTheirSelectionTextsAndDataThroughInsertsAndDeletes)
     info.SetMask(wxLIST_MASK_IMAGE | wxLIST_MASK_STATE);
     info.SetStateMask(wxLIST_STATE_SELECTED);
     EXPECT_TRUE(m_list->GetItem(info) && info.GetImage() == 0 && info.GetState() == wxLIST_STATE_SELECTED);
+    wxListItem data;
+    data.SetId(1);
+    data.SetMask(wxLIST_MASK_DATA);
+    data.SetData(7);
+    EXPECT_TRUE(m_list->SetItem(data) && m_list->GetItemData(1) == 7);
     m_list->DeleteAllItems();
     Run("top 0||@-1;");
+    // A larger font makes taller rows.
+    const int lineHeight = m_rows->GetLineHeight();
+    m_list->SetFont(m_list->GetFont().Scaled(2));
+    m_rows->LayoutIfNeeded();
+    EXPECT_GT(m_rows->GetLineHeight(), lineHeight);
 }
 
 // An index one past the last row, or beyond it, changes nothing and reports nothing.
