@@ -1,5 +1,6 @@
 // The lists and boxes as accessibility tools get them: the ATK objects GTK
 // would put on the bus, read in process (no bus needed).
+#include "components/Utility/CustomComboBox.h"
 #include "components/Utility/profilescustomlistctrl.h"
 #include "platform/automation/atk/AccessibleExposure.h"
 
@@ -8,6 +9,7 @@
 #include <atk/atk.h>
 #include <gtest/gtest.h>
 #include <wx/frame.h>
+#include <wx/panel.h>
 
 #include <string>
 #include <utility>
@@ -139,6 +141,35 @@ TEST_F(AccessibleTest, TheListIsATableThatReadsAndChangesAsTheListDoesAndAnswers
     g_object_unref(table);
     EXPECT_EQ(atk_object_get_parent(live), nullptr);
     g_object_unref(live);
+}
+
+// The filter box is a combo box whose entries are a list, shown only while it is dropped down.
+TEST_F(AccessibleTest, TheBoxIsAComboBoxWithItsEntriesAsAListShownWhileDropped)
+{
+    auto* combo = new CustomComboBox;
+    combo->Create(new wxPanel(frame), wxID_ANY, wxPoint(10, 10), wxSize(160, -1));
+    for (const char* entry : {"All", "PRN-01", "PRN-02"})
+        combo->Append(entry);
+    combo->SetSelection(1);
+    frame->Show();
+    AtkObject* box = AccessibleOf(combo);
+    ASSERT_TRUE(guitest::PumpUntil([&] { return HasState(box, ATK_STATE_SHOWING); }));
+    EXPECT_EQ(atk_object_get_role(box), ATK_ROLE_COMBO_BOX);
+    EXPECT_EQ(Name(box), "PRN-01");
+    ASSERT_EQ(atk_object_get_n_accessible_children(box), 1);
+    AtkObject* list = atk_object_ref_accessible_child(box, 0);
+    EXPECT_EQ(atk_object_get_n_accessible_children(list), 3);
+    for (const bool dropped : {true, false, true, false})
+    {
+        dropped ? combo->ShowPopup() : combo->HidePopup();
+        ASSERT_TRUE(guitest::PumpUntil([&] { return combo->IsPopupShown() == dropped; }));
+        EXPECT_EQ(HasState(box, ATK_STATE_EXPANDED), dropped);
+        EXPECT_EQ(HasState(list, ATK_STATE_SHOWING), dropped);
+        gint x = -1, y = -1, width = -1, height = -1;
+        atk_component_get_extents(ATK_COMPONENT(list), &x, &y, &width, &height, ATK_XY_SCREEN);
+        EXPECT_EQ(width > 0, dropped) << "a closed list has no place on the screen";
+    }
+    g_object_unref(list);
 }
 
 } // namespace
