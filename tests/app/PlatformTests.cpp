@@ -152,6 +152,8 @@ TEST(FileContents, TellsAMissingFileFromAnUnreadableOneReadsNoMoreThanAskedAndRe
     const auto file = folder.Write("file", "0123456789");
     ASSERT_EQ(wyxos::ReadFileContents(file.string(), bytes, 4), wyxos::ReadResult::Read);
     EXPECT_EQ(bytes, "0123");
+    EXPECT_EQ(wyxos::ReadFileContents((file / "below").string(), bytes), wyxos::ReadResult::Missing)
+        << "below a file is nothing";
     // A rewrite keeps the group of the writer's own file (only root may give it to another group).
     struct stat info;
     if (::geteuid() == 0 && ::chown(file.c_str(), 0, 1) == 0)
