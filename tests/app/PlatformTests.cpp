@@ -16,6 +16,7 @@
 #include <gtest/gtest.h>
 
 #include "TempFolder.h"
+#include "WaitUntil.h"
 #include "app/CrashReporterLoader.h"
 #include "platform/os/FileContents.h"
 #include "platform/os/FileLock.h"
@@ -203,13 +204,6 @@ TEST(FileLock, AWaitForAHeldLockSleepsAndEndsWhenToldTo)
     wyxos::CloseLockFile(waiter);
 }
 
-template <typename Done> bool WaitFor(Done done)
-{
-    for (int i = 0; i < 10000 && !done(); ++i)
-        std::this_thread::sleep_for(std::chrono::milliseconds(1));
-    return done();
-}
-
 // One copy per user: the lock and the knock live in the user's own runtime folder.
 TEST(SecondCopy, FindsTheFirstThroughItsRuntimeFolderAndKnocksOnlyOnIt)
 {
@@ -233,7 +227,7 @@ TEST(SecondCopy, FindsTheFirstThroughItsRuntimeFolderAndKnocksOnlyOnIt)
         ASSERT_TRUE(b.IsListening()) << "two names, two sockets";
         EXPECT_TRUE(std::filesystem::exists(runtime.Path() / "a.sock"));
         EXPECT_TRUE(wyxos::InstanceSignal::Knock("a"));
-        EXPECT_TRUE(WaitFor([&] { return knocksOnA == 1; }));
+        EXPECT_TRUE(WaitUntil([&] { return knocksOnA == 1; }));
         EXPECT_FALSE(wyxos::InstanceSignal::Knock("c"));
     }
     EXPECT_EQ(knocksOnB, 0);

@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include "ProgramSandbox.h"
+#include "WaitUntil.h"
 
 namespace
 {
@@ -68,8 +69,7 @@ TEST(InstalledTest, AnInstallToAnyPrefixAndTheUnpackedDebianPackageRunWithoutALi
             EXPECT_EQ(box.x.WaitForWindow(second), 0u) << "the second copy opened a window";
             EXPECT_TRUE(WIFEXITED(second.Wait())) << second.Outcome();
             // The knock is handled on the first copy's main loop.
-            while (Focused(display.get()) != window && !first.HasEnded())
-                ::usleep(20000);
+            WaitUntil([&] { return Focused(display.get()) == window || first.HasEnded(); });
             EXPECT_EQ(Focused(display.get()), window) << "the first copy " << first.Outcome();
             box.Close(first, window);
         }

@@ -17,6 +17,8 @@
 #include "pump/bus/CustomEvents.h"
 #include "pump/bus/EventBus.h"
 
+#include "WaitUntil.h"
+
 namespace
 {
 
@@ -28,12 +30,6 @@ struct WxBaseEnvironment : ::testing::Environment
     void TearDown() override { wxUninitialize(); }
 };
 const auto* const registered = ::testing::AddGlobalTestEnvironment(new WxBaseEnvironment);
-
-template <typename Done> void WaitUntil(Done done)
-{
-    while (!done())
-        std::this_thread::sleep_for(std::chrono::milliseconds(1));
-}
 
 struct StopCase
 {
