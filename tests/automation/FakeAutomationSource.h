@@ -11,7 +11,8 @@
 namespace automationtest
 {
 
-// A control made of plain fields, as a test or the fuzzer sets them.
+// A control made of plain fields, as a test or the fuzzer sets them, 300 by 200
+// pixels with rows 20 high.
 struct FakeSource : automation::AutomationSource
 {
     automation::ControlKind kind = automation::ControlKind::ListCtrl;
@@ -23,7 +24,6 @@ struct FakeSource : automation::AutomationSource
     bool singleSelection = true, dropped = false;
     std::optional<int> headerHeight;
     int scrolledLeft = 0;
-    automation::Rect client{0, 0, 300, 200};
     const FakeSource *header = nullptr, *popup = nullptr;
 
     automation::ControlKind Kind() const override { return kind; }
@@ -41,25 +41,23 @@ struct FakeSource : automation::AutomationSource
     {
         return size_t(item) < states.size() ? states[size_t(item)] : 0;
     }
-    int ItemImage(long item, int column) const override { return column == 1 ? 7 : -1; }
+    int ItemImage(long, int column) const override { return column == 1 ? 7 : -1; }
     std::intptr_t ItemData(long item) const override { return 1000 + item; }
     bool IsSingleSelection() const override { return singleSelection; }
     long SelectedCount() const override
     {
         return std::count_if(states.begin(), states.end(),
-                             [](unsigned state) { return state & automation::itemstate::kSelected; });
+                             [](unsigned s) { return s & automation::itemstate::kSelected; });
     }
     bool ItemRect(long item, automation::Rect& rect) const override
     {
-        const int y = int(item - top) * 20; // rows 20 pixels high
-        rect = automation::Rect{0, y, client.right, y + 20};
+        rect = automation::Rect{0, int(item - top) * 20, 300, int(item - top) * 20 + 20};
         return item >= 0 && item < ItemCount();
     }
     bool CellRect(long item, int column, automation::Rect& rect) const override
     {
-        if (!ItemRect(item, rect) || column < 0 || size_t(column) >= columns.size())
+        if (!ItemRect(item, rect) || size_t(column) >= columns.size()) // a negative column wraps to none
             return false;
-        rect.left = 0;
         for (int i = 0; i < column; ++i)
             rect.left += columns[size_t(i)].width;
         rect.right = rect.left + columns[size_t(column)].width;
@@ -76,7 +74,7 @@ struct FakeSource : automation::AutomationSource
     int ItemHeight(long) const override { return 18; }
     bool IsDroppedDown() const override { return dropped; }
     const automation::AutomationSource* Popup() const override { return popup; }
-    automation::Rect ClientRect() const override { return client; }
+    automation::Rect ClientRect() const override { return automation::Rect{0, 0, 300, 200}; }
 };
 
 // Memory that holds only what a test says it holds.
