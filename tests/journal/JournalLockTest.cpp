@@ -54,14 +54,14 @@ TEST_F(JournalLock, TwoLocksOfOneNameExcludeEachOtherUntilOneIsReleasedOrGone)
     EXPECT_EQ(openFiles(), before);
 }
 
-TEST_F(JournalLock, WritersAndTheCommandWaitUntilTheLockIsReleased)
+TEST_F(JournalLock, WhileTheLockIsHeldWritersWaitAndThoseThatMustNotWaitGiveUpKeepingTheirLines)
 {
+    std::future<int> add; // joined after the holder has gone
+    named_mutex_lock holder(kStatus);
     for (bool command : {false, true})
     {
         SCOPED_TRACE(command ? "wyx-journal" : "AddJob");
         WriteBytes(StatusJournal(), kOne);
-        std::future<int> add; // joined after the holder has gone
-        named_mutex_lock holder(kStatus);
         ASSERT_TRUE(holder.lock());
         add = std::async(
             std::launch::async,
@@ -78,24 +78,20 @@ TEST_F(JournalLock, WritersAndTheCommandWaitUntilTheLockIsReleased)
         EXPECT_EQ(add.get(), wyx::JobOk);
         EXPECT_EQ(ReadBytes(StatusJournal()), kOne + "2\tb\tADDED\r\n");
     }
-}
 
-TEST_F(JournalLock, AReaderThatMustNotWaitGivesUpWithLockFailedAndKeepsItsLines)
-{
-    WriteBytes(LogJournal(), kOne);
-    named_mutex_lock holder(kLog);
+    WriteBytes(StatusJournal(), kOne);
     ASSERT_TRUE(holder.lock());
     const std::atomic<bool> running{false};
-    wyx::JobsFileReadWriter journal = Journal(LogJournal());
+    wyx::JobsFileReadWriter journal = Journal(StatusJournal());
     journal.SetKeepWaiting(&running);
     wxArrayString lines;
     lines.Add("kept");
     EXPECT_EQ(journal.ReadJobs(lines), wyx::JobLockFailed);
-    EXPECT_EQ(Utf8Lines(lines), Lines{"kept"});
+    EXPECT_EQ(wxJoin(lines, '|'), "kept");
     wxString line = "2\tb";
     EXPECT_EQ(journal.AddJob(line), wyx::JobLockFailed);
-    EXPECT_EQ(Utf8(line), "2\tb");
-    EXPECT_EQ(ReadBytes(LogJournal()), kOne);
+    EXPECT_EQ(line.utf8_string(), "2\tb");
+    EXPECT_EQ(ReadBytes(StatusJournal()), kOne);
     // A wait ends when the flag turns false, and succeeds once the lock is released.
     for (bool release : {false, true})
     {
@@ -103,7 +99,7 @@ TEST_F(JournalLock, AReaderThatMustNotWaitGivesUpWithLockFailedAndKeepsItsLines)
         std::future<bool> wait = std::async(std::launch::async,
                                             [&waiting]
                                             {
-                                                named_mutex_lock lock(kLog);
+                                                named_mutex_lock lock(kStatus);
                                                 return lock.lock(&waiting);
                                             });
         (release ? holder.unlock() : void(waiting = false));
@@ -142,8 +138,7 @@ TEST_F(AtomicWrite, ARewriteIsANewFileWithTheOldModeAndOwnerAndLinksStayLinks)
     const bool root = ::geteuid() == 0;
     WriteBytes(StatusJournal(), kOne);
     ASSERT_EQ(::chmod(StatusJournal().c_str(), 0640), 0);
-    if (root)
-        ASSERT_EQ(::chown(StatusJournal().c_str(), 4321, 4322), 0);
+    ASSERT_EQ(root ? ::chown(StatusJournal().c_str(), 4321, 4322) : 0, 0);
     struct stat before = {}, after = {};
     ASSERT_EQ(::stat(StatusJournal().c_str(), &before), 0);
     ASSERT_EQ(RunTool({"status", "add", "2\tb"}), 0);
@@ -242,22 +237,19 @@ TEST_F(JournalPlant, AReadOnlyJournalIsReplacedByRootAloneNeverBehindItsOwnersBa
     if (::geteuid() != 0)
         GTEST_SKIP() << "needs root to run the command as another user";
     // Folders writable by everyone, as 1777 folders are.
-    fs::permissions(Root(), fs::perms::owner_all | fs::perms::group_read | fs::perms::group_exec |
-                                fs::perms::others_read | fs::perms::others_exec);
-    fs::permissions(DataDirectory(), fs::perms::all | fs::perms::sticky_bit);
+    fs::permissions(Root(), static_cast<fs::perms>(0755));
+    fs::permissions(DataDirectory(), static_cast<fs::perms>(01777));
     fs::create_directories(Root() + "/dev/shm");
-    fs::permissions(Root() + "/dev/shm", fs::perms::all | fs::perms::sticky_bit);
+    fs::permissions(Root() + "/dev/shm", static_cast<fs::perms>(01777));
+    const std::string nobody =
+        "exec setpriv --reuid=65534 --regid=65534 --clear-groups " + Quoted(WYX_JOURNAL_TOOL);
     for (Arguments operation : kWritingOperations)
     {
         WriteBytes(StatusJournal(), kOne);
         ASSERT_EQ(::chmod(StatusJournal().c_str(), 0444), 0);
         ASSERT_EQ(::chown(StatusJournal().c_str(), 65534, 65534), 0);
         operation[0] = StatusJournal();
-        EXPECT_EQ(Run("exec setpriv --reuid=65534 --regid=65534 --clear-groups " + Quoted(WYX_JOURNAL_TOOL),
-                      operation)
-                      .first,
-                  wyx::JobWriteFailed)
-            << operation[1];
+        EXPECT_EQ(Run(nobody, operation).first, wyx::JobWriteFailed) << operation[1];
         EXPECT_EQ(ReadBytes(StatusJournal()), kOne) << operation[1];
         EXPECT_EQ(FolderEntries(DataDirectory()), Lines{"TiveraJobsStatusFile.txt"});
         ::unlink(StatusJournal().c_str());
@@ -274,15 +266,8 @@ TEST_F(JournalPlant, TheSimulatorWritesThroughNoLink)
 {
     const std::string hotFolders = Root() + "/srv/hotfolders", victim = Root() + "/victim.txt";
     WriteBytes(victim, "not the simulator's\n");
-    SimulatorOptions options;
-    options.jobsPerSecond = 200;
-    options.durationSeconds = 0.1;
-    options.stepSeconds = 0.002;
-    options.failureShare = 1;
-    options.seed = 7;
-    options.seedGiven = true;
-    options.dataDirectory = DataDirectory();
-    options.hotFolderRoot = hotFolders;
+    // 200 jobs a second for 0.1 s, every one failing, 0.002 s in each stage, from a fixed seed.
+    const SimulatorOptions options{200, 0.1, 1, 0.002, 7, true, DataDirectory(), hotFolders};
     HotFolderSimulator simulator(options, [] { return false; });
     wxString problem;
     if (::geteuid() == 0) // only root can give a link to another user
