@@ -58,14 +58,6 @@ public:
             names.push_back(entry.path().filename().string());
         return names;
     }
-    static std::string Utf8(const wxString& text) { return text.utf8_string(); }
-    static Lines Utf8Lines(const wxArrayString& lines)
-    {
-        Lines result;
-        for (const wxString& line : lines)
-            result.push_back(line.utf8_string());
-        return result;
-    }
 
     // A reader-writer of the journal, as the models and the tool make it.
     static wyx::JobsFileReadWriter Journal(const std::string& path)
@@ -79,7 +71,10 @@ public:
     {
         wxArrayString lines;
         EXPECT_EQ(Journal(path).ReadJobs(lines), wyx::JobOk) << path;
-        return Utf8Lines(lines);
+        Lines result;
+        for (const wxString& line : lines)
+            result.push_back(line.utf8_string());
+        return result;
     }
 
     static std::string Quoted(const std::string& text)
