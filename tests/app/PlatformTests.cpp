@@ -8,7 +8,6 @@
 #include <chrono>
 #include <ctime>
 #include <fstream>
-#include <memory>
 #include <sstream>
 #include <thread>
 #include <tuple>
@@ -70,8 +69,7 @@ TEST(CrashReporter, OnlyALibraryWithBothEntriesIsFoundThroughTheRegistryInstalle
 
 TEST(LogDirectory, ResolvesUnderTheStateFolderAndCreatesNothing)
 {
-    // The state folder, the home folder, the name, the folder expected; "" and relative folders count as
-    // unset.
+    // The state folder (relative: unset), the home folder, the name, the folder expected.
     const std::tuple<const char*, const char*, const char*, const char*> cases[] = {
         {"/state/", "/home/u", "WyxProgress", "/state/WyxProgress"},
         {"state", "/home/u", "WyxProgress", "/home/u/.local/state/WyxProgress"},
@@ -210,15 +208,10 @@ TEST(Heap, FreedMemoryBeyondWhatARebuildNeedsGoesBackToTheSystem)
     EXPECT_FALSE(wyxos::ReturnLargeFreeHeap(kKept)) << "nothing much is free yet";
     // A huge journal's records, 48 MiB of small blocks; when it shrinks a few
     // stay scattered among the freed ones, so trimming the heap's top gives nothing back.
-    std::vector<std::unique_ptr<char[]>> records(48 * 1024 / 4);
-    for (std::size_t i = 0; i < records.size(); ++i)
-    {
-        records[i] = std::make_unique<char[]>(4096);
-        records[i][0] = records[i][4095] = 1;
-    }
+    std::vector<std::vector<char>> records(48 * 1024 / 4, std::vector<char>(4096, 1));
     for (std::size_t i = 0; i < records.size(); ++i)
         if (i % 64 != 0)
-            records[i].reset();
+            std::vector<char>().swap(records[i]);
     const long before = ResidentKiB();
     EXPECT_TRUE(wyxos::ReturnLargeFreeHeap(kKept));
     EXPECT_LT(ResidentKiB(), before - 30 * 1024);

@@ -18,14 +18,9 @@ const std::string kTwoKeys = kCrash +
 
 TEST(RegistryFile, ParsingFindsExactlyTheValuesTheFileHolds)
 {
-    struct Case
-    {
-        std::string text;
-        const char* key;
-        const char* name;
-        const char* value; // null: none found
-    };
-    for (const Case& c : std::vector<Case>{
+    // The file, the key, the name, the value (null: none found).
+    for (const auto& [text, key, name, expected] :
+         std::vector<std::tuple<std::string, const char*, const char*, const char*>>{
              {kTwoKeys, kCrashKey, "InstallPath", "/opt/crash"},
              {kTwoKeys, "SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve", "InstallPath", "/opt/kelvo"},
              // Key and name without regard to case.
@@ -45,15 +40,15 @@ TEST(RegistryFile, ParsingFindsExactlyTheValuesTheFileHolds)
              {kCrash + "InstallPath\n", kCrashKey, "InstallPath", nullptr}})
     {
         wxString value = "untouched";
-        EXPECT_EQ(wyxos::RegistryFile::Parse(wxString::FromUTF8(c.text))
-                      .QueryValue(wxString::FromUTF8(c.key), wxString::FromUTF8(c.name), value),
-                  c.value != nullptr)
-            << c.text;
-        EXPECT_EQ(value, wxString::FromUTF8(c.value ? c.value : "untouched")) << c.text;
+        EXPECT_EQ(wyxos::RegistryFile::Parse(wxString::FromUTF8(text))
+                      .QueryValue(wxString::FromUTF8(key), wxString::FromUTF8(name), value),
+                  expected != nullptr)
+            << text;
+        EXPECT_EQ(value, wxString::FromUTF8(expected ? expected : "untouched")) << text;
     }
 }
 
-TEST(RegistryFile, IsReadBelowTheSystemRootInItsEncodingAndNeverFromAFifoOrFolder)
+TEST(RegistryFile, IsReadBelowTheSystemRootInItsEncodingNeverFromAFifoOrFolderAndGivesTheInstallPathIfItFits)
 {
     TempFolder folder;
     ScopedEnv root("WYX_SYSTEM_ROOT", folder.Path().string());
@@ -75,14 +70,9 @@ TEST(RegistryFile, IsReadBelowTheSystemRootInItsEncodingAndNeverFromAFifoOrFolde
         ASSERT_TRUE(wyxos::ReadRegistryValue(kCrashKey, "InstallPath", value)) << expected;
         EXPECT_EQ(value, wxString::FromUTF8(expected));
     }
-}
 
-TEST(InstallPath, IsTheRegistryValueIfItFitsTheValueBuffer)
-{
-    TempFolder folder;
-    ScopedEnv root("WYX_SYSTEM_ROOT", folder.Path().string());
-    EXPECT_EQ(ReadInstallPath(), "");
-    // 517 bytes hold 257 UTF-16 units and the terminator; U+1F5A8 takes two units.
+    // The install path, if it fits the value buffer: 517 bytes hold 257 UTF-16 units and the
+    // terminator; U+1F5A8 takes two units.
     const std::string longest = "/" + std::string(256, 'a'), printer = "\xF0\x9F\x96\xA8";
     const std::string key = "[SOFTWARE\\Kelvo Systems\\Corvane Duv Ureruve]\n";
     for (const auto& [text, expected] : std::vector<std::pair<std::string, std::string>>{
