@@ -108,17 +108,17 @@ TEST(QueryAnswers, EachControlAnswersItsOwnMessagesInRangeAndNoOthers)
 TEST(QueryAnswers, TextsGoOnlyIntoWritableBuffersWithRoomForThemAndTheirTerminatorsAndSearchesStayInBounds)
 {
     Fixture f;
-    const auto kind = [&](const FakeSource& to, std::uint16_t capacity, size_t at = 0)
+    // The kind's name, into a buffer whose first unit gives its room: all of it and its terminator or
+    // nothing.
+    const std::tuple<std::uint16_t, Answer, std::u16string> kinds[] = {
+        {9, 1, u"ListCtrl"}, {8, 0, u"\u0008"}, {1100, 0, u"\u044c"}}; // 1100 units reach the read-only half
+    for (const auto& [capacity, answer, text] : kinds)
     {
         std::memset(f.bytes, 0, sizeof f.bytes);
-        std::memcpy(f.At<char>(at), &capacity, sizeof capacity);
-        const Answer answer = f.Ask(to, kKind, kKindQuery, f.Address(at));
-        return std::pair(answer, f.Text(at));
-    };
-    using Kind = std::pair<Answer, std::u16string>; // left as it was: the capacity, then nothing
-    EXPECT_EQ(kind(f.list, 9), Kind(1, u"ListCtrl"));
-    EXPECT_EQ(kind(f.list, 8), Kind(0, u"\u0008"));
-    EXPECT_EQ(kind(f.list, 1100), Kind(0, u"\u044c"));
+        std::memcpy(f.bytes, &capacity, sizeof capacity);
+        EXPECT_EQ(f.Ask(f.list, kKind, kKindQuery, f.Address(0)), answer) << capacity;
+        EXPECT_EQ(f.Text(0), text);
+    }
 
     // A list item into an LVITEMW at the start, its text buffer at 512 (or read-only).
     const auto item = [&](unsigned mask, int row, int column, int capacity, size_t textAt = 512)
