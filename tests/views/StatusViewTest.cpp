@@ -10,10 +10,8 @@
 #include "../listctrl/ListTestSupport.h"
 #include "../status/StatusTestSupport.h"
 #include "DrawNow.h"
-#include "ScreenGrab.h"
+#include "PixelCompare.h"
 #include "ViewTest.h"
-
-#include <cstring>
 
 namespace
 {
@@ -23,12 +21,6 @@ wxString Line(const wxString& key, const wxString& server, const wxString& statu
 {
     return key + "\t/srv/in/Proofs\t/srv/in/Proofs/" + key + ".pdf\t" + server + "\t" + dosTime + "\t" +
            status + "\t" + size + "\tPDF\tADDED\n";
-}
-
-bool SameImage(const wxImage& a, const wxImage& b)
-{
-    return a.GetSize() == b.GetSize() &&
-           memcmp(a.GetData(), b.GetData(), static_cast<size_t>(a.GetWidth() * a.GetHeight() * 3)) == 0;
 }
 
 class StatusView : public ViewTest<JobStatusView, JobStatusManager, statustest::SystemRoot>
@@ -52,17 +44,6 @@ protected:
 
     long Selected() const { return Rows()->GetNextItem(-1, wxLIST_NEXT_ALL, wxLIST_STATE_SELECTED); }
 
-    // Opens the box, which lists the servers anew, and chooses the entry.
-    void ChooseServer(const wxString& entry)
-    {
-        wxCommandEvent press(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK);
-        view->ProcessWindowEvent(press);
-        const int index = view->GetServerBox()->FindString(entry, true);
-        view->GetServerBox()->SetSelection(index);
-        wxCommandEvent chosen(wxEVT_COMBOBOX, JobStatusView::kServerBoxId);
-        chosen.SetInt(index);
-        view->GetServerBox()->GetEventHandler()->ProcessEvent(chosen);
-    }
     void Tick()
     {
         wxTimer timer;
@@ -86,7 +67,13 @@ TEST_F(StatusView, RowsFollowTheJournalTheSortAndTheServerChosenAndTheSelectionS
     SendList(wxEVT_LIST_COL_CLICK, -1);
     EXPECT_EQ(Column(1), (Texts{"b", "a", "C"}));
     EXPECT_EQ(Selected(), 0) << "the selection moves with its job";
-    ChooseServer("srv1");
+    // Opening the box lists the servers anew; then srv1 is chosen.
+    wxCommandEvent press(wxEVT_MY_CUSTOM_COMMAND_COMBOCLICK);
+    view->ProcessWindowEvent(press);
+    view->GetServerBox()->SetSelection(1);
+    wxCommandEvent chosen(wxEVT_COMBOBOX, JobStatusView::kServerBoxId);
+    chosen.SetInt(1);
+    view->GetServerBox()->GetEventHandler()->ProcessEvent(chosen);
     EXPECT_EQ(view->GetServerBox()->GetStrings(), wxSplit("All Servers      ,srv1,srv2", ','));
     EXPECT_EQ(Column(1), (Texts{"b", "a"}));
     Produce(Line("a", "srv1 ", "Queued", "1383035100") + Line("b", "srv1", "Queued", "1383035000") +
@@ -128,32 +115,36 @@ TEST_F(StatusView,
         Rows()->SetColumnWidth(column, 1000);
         const wxImage roomy = listtest::RenderRows(Rows()).GetSubImage(cell);
         Rows()->SetColumnWidth(column, width);
-        EXPECT_TRUE(SameImage(fitted, roomy)) << "column " << column << " shortens its text";
+        EXPECT_EQ(pixels::FirstDifference(fitted, roomy), "") << "column " << column << " shortens its text";
     }
 
-    const auto screen = [rows]
-    { return GrabScreen(wxRect(rows->GetScreenPosition(), rows->GetClientSize())); };
     wxRect status;
     Rows()->GetSubItemRect(0, 7, status);
     const auto wheel = [&](long row) { return wxRect(status.x, row * lineHeight, 18, lineHeight); };
-    Tick();          // the first tick shows the frame the rows started with
-    guitest::Pump(); // nothing on the display tells that the toolkit has painted it
-    const wxImage before = screen();
+    // The paint a tick asks for, which the drawings below would not show.
+    wxRegion painted;
+    rows->Bind(wxEVT_PAINT,
+               [&](wxPaintEvent& event)
+               {
+                   painted.Union(rows->GetUpdateRegion());
+                   event.Skip();
+               });
+    Tick(); // the first tick shows the frame the rows started with
+    const wxImage before = DrawNow(rows);
+    ASSERT_TRUE(guitest::PumpUntil([&] { return painted.Contains(wheel(3)) == wxInRegion; }));
+    painted.Clear();
     Tick();
-    wxImage after;
-    ASSERT_TRUE(guitest::PumpUntil(
-        [&]
-        {
-            return (after = screen()).IsOk() &&
-                   !SameImage(before.GetSubImage(wheel(3)), after.GetSubImage(wheel(3)));
-        }));
+    ASSERT_TRUE(guitest::PumpUntil([&] { return painted.Contains(wheel(3)) == wxInRegion; }));
+    const wxImage after = DrawNow(rows);
     for (long row = 0; row < 4; ++row)
     {
         const wxRect rest(0, row * lineHeight, status.x, lineHeight);
-        EXPECT_EQ(SameImage(before.GetSubImage(wheel(row)), after.GetSubImage(wheel(row))),
-                  row == 1 || row == 2)
+        EXPECT_EQ(
+            pixels::FirstDifference(before.GetSubImage(wheel(row)), after.GetSubImage(wheel(row))).empty(),
+            row == 1 || row == 2)
             << "only rows 0 and 3 are in progress; row " << row;
-        EXPECT_TRUE(SameImage(before.GetSubImage(rest), after.GetSubImage(rest))) << "row " << row;
+        EXPECT_EQ(pixels::FirstDifference(before.GetSubImage(rest), after.GetSubImage(rest)), "")
+            << "row " << row;
     }
 }
 } // namespace
