@@ -1,7 +1,8 @@
 // The whole window built under a German locale with the shipped catalogs, as
 // the program builds it after choosing German: what the user reads on the tabs,
-// the column headings, a footer and the rows of the log. (The title is read
-// from the installed program's window, in InstallTests.)
+// a footer and the rows of the log, whose texts are translated as they are
+// shown. (CatalogTest finds a text the sources leave untranslated; the title
+// is read from the installed program's window, in InstallTests.)
 #include "app/MainFrame.h"
 #include "app/MainView.h"
 #include "components/Utility/CustomListCtrl.h"
@@ -21,21 +22,7 @@
 namespace
 {
 
-// The column headings of a list, joined by "|".
-template <typename List> wxString Headings(const List* list)
-{
-    wxString texts;
-    for (int column = 0; column < list->GetColumnCount(); ++column)
-    {
-        wxListItem item;
-        item.SetMask(wxLIST_MASK_TEXT);
-        list->GetColumn(column, item);
-        texts += (column > 0 ? "|" : "") + item.GetText();
-    }
-    return texts;
-}
-
-TEST(GermanWindowTest, TabsHeadingsLogRowsAndTheFooterAreGerman)
+TEST(GermanWindowTest, TabsLogRowsAndTheFooterAreGerman)
 {
     wxLocale locale;
     ASSERT_TRUE(locale.Init(wxLANGUAGE_GERMAN_GERMANY, wxLOCALE_LOAD_DEFAULT))
@@ -50,14 +37,11 @@ TEST(GermanWindowTest, TabsHeadingsLogRowsAndTheFooterAreGerman)
     CMainFrame* frame = new CMainFrame("", wxDefaultPosition, wxSize(800, 600));
     frame->Show();
     ASSERT_TRUE(guitest::PumpUntil([frame] { return frame->GetNotebook()->GetPageCount() == 2; }));
-    auto* status = static_cast<JobStatusView*>(frame->GetStatusView());
     auto* log = static_cast<JobLogView*>(frame->GetLogView());
     EXPECT_EQ(frame->GetNotebook()->GetPageText(0) + "|" + frame->GetNotebook()->GetPageText(1),
               "Status|Protokoll");
-    EXPECT_EQ(Headings(status->GetJobList()),
-              wxString::FromUTF8("Nr.|Dateiname|Format|Hotfolder|Server|Größe|Zeit|Status"));
-    EXPECT_EQ(Headings(log->GetLogList()), " |Dateiname|Hotfolder|Server|Startzeit|Status");
-    EXPECT_EQ(status->GetFooter()->GetStatusText(0), "0 Elemente ");
+    EXPECT_EQ(static_cast<JobStatusView*>(frame->GetStatusView())->GetFooter()->GetStatusText(0),
+              "0 Elemente ");
 
     JobLogManager::GetInstance().Refresh();
     ProfilesKelvoProfilesListCtrl* list = log->GetLogList();
