@@ -10,7 +10,9 @@ using namespace automation;
 namespace
 {
 
-TEST(PointerCheck, AStructureMustLieWhollyInOneAccessibleRegion)
+const char kConstantText[] = "held in read-only memory";
+
+TEST(PointerCheck, AStructureMustLieWhollyInOneAccessibleRegionOfTheMap)
 {
     // Writable, no access, a guard page, read-only, writable again.
     const RegionList memory({{0x6000, 0x7000, true, true, false, false},
@@ -28,18 +30,14 @@ TEST(PointerCheck, AStructureMustLieWhollyInOneAccessibleRegion)
         EXPECT_EQ(std::pair(IsReadable(memory, address, size), IsWritable(memory, address, size)),
                   std::pair(readable, writable))
             << std::hex << address << "+" << size;
-}
 
-const char kConstantText[] = "held in read-only memory";
-
-TEST(PointerCheck, TheProcessOwnMapKnowsItsStackAndItsConstants)
-{
-    ProcessMemory memory;
+    // The process's own map knows its stack and its constants.
+    ProcessMemory process;
     int onStack = 0;
-    EXPECT_TRUE(IsWritable(memory, reinterpret_cast<std::uintptr_t>(&onStack), sizeof onStack));
-    EXPECT_TRUE(IsReadable(memory, reinterpret_cast<std::uintptr_t>(kConstantText), sizeof kConstantText));
-    EXPECT_FALSE(IsWritable(memory, reinterpret_cast<std::uintptr_t>(kConstantText), sizeof kConstantText));
-    EXPECT_FALSE(IsReadable(memory, 16, 4));
+    EXPECT_TRUE(IsWritable(process, reinterpret_cast<std::uintptr_t>(&onStack), sizeof onStack));
+    EXPECT_TRUE(IsReadable(process, reinterpret_cast<std::uintptr_t>(kConstantText), sizeof kConstantText));
+    EXPECT_FALSE(IsWritable(process, reinterpret_cast<std::uintptr_t>(kConstantText), sizeof kConstantText));
+    EXPECT_FALSE(IsReadable(process, 16, 4));
 }
 
 } // namespace

@@ -52,7 +52,6 @@ struct Fixture
         combo.popup = &popup;
         popup = combo;
         popup.kind = ControlKind::ListBox;
-        popup.handle = 0x3000;
     }
     template <class T> T* At(size_t offset) { return reinterpret_cast<T*>(bytes + offset); }
     std::intptr_t Address(size_t offset) { return reinterpret_cast<std::intptr_t>(bytes + offset); }
