@@ -35,9 +35,7 @@ struct Fixture
     {
         list.rows = {{u"1", u"a.pdf", u"PDF"}, {u"2", u"b.ps", u"PostScript"}, {u"3", u"c.tif", u"TIFF"}};
         list.states = {0, itemstate::kSelected, itemstate::kFocused};
-        list.columns = {{u"No.", 40, Alignment::Left, -1},
-                        {u"File Name", 120, Alignment::Right, 2},
-                        {u"Format", -1, Alignment::Centre, -1}};
+        list.columns = {{u"No.", 40}, {u"File Name", 120}, {u"Format", -1}};
         list.current = 2;
         list.top = 1;
         list.headerHeight = 25;
@@ -49,7 +47,6 @@ struct Fixture
         combo.rows = {{u"All"}, {u"PRN-01"}, {u"prn-02"}, {u"\u00c4rger"}};
         combo.current = combo.top = 1;
         combo.lastVisible = 2;
-        combo.popup = &popup;
         popup = combo;
         popup.kind = ControlKind::ListBox;
     }
