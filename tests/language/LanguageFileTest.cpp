@@ -81,12 +81,10 @@ TEST(LanguageFileTest, DecodesFindsTheCodesAndReadsBothFilesFromTheirPlacesButNo
     EXPECT_EQ(wyxos::UserConfigFolder(), (folder.Path() / "config").string());
     ScopedEnv relative("XDG_CONFIG_HOME", "relative/config"), home("HOME", folder.Path().string());
     EXPECT_EQ(wyxos::UserConfigFolder(), (folder.Path() / ".config").string());
-    {
-        ScopedEnv lang("LANG", "fr_FR.UTF-8"), messages("LC_MESSAGES", "de_DE.UTF-8"), all("LC_ALL", "");
-        EXPECT_EQ(uilanguage::SystemLanguageSources().SystemLanguageId(), 0x0407u);
-        ScopedEnv c("LC_ALL", "C");
-        EXPECT_EQ(uilanguage::SystemLanguageSources().SystemLanguageId(), 0u);
-    }
+    ScopedEnv lang("LANG", "fr_FR.UTF-8"), messages("LC_MESSAGES", "de_DE.UTF-8"), all("LC_ALL", "");
+    EXPECT_EQ(uilanguage::SystemLanguageSources().SystemLanguageId(), 0x0407u);
+    ScopedEnv c("LC_ALL", "C");
+    EXPECT_EQ(uilanguage::SystemLanguageSources().SystemLanguageId(), 0u);
 }
 
 } // namespace
