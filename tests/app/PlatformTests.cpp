@@ -1,5 +1,5 @@
-// The crash reporter loader, the log folder, the system root, the heap, files,
-// locks and the second copy's signal.
+// The crash reporter loader, the system root, the heap, files, locks and the
+// second copy's signal.
 #include <stdlib.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -23,7 +23,6 @@
 #include "platform/os/InstanceLock.h"
 #include "platform/os/InstanceSignal.h"
 #include "platform/os/SystemPaths.h"
-#include "platform/services/WyxLogger.h"
 
 namespace
 {
@@ -64,20 +63,6 @@ TEST(CrashReporter, OnlyALibraryWithBothEntriesIsFoundThroughTheRegistryInstalle
         loader.Uninstall();
     }
     EXPECT_EQ(calls(), "");
-}
-
-// The program names its log folder below the user's state folder, which it does not create.
-TEST(LogDirectory, ResolvesUnderTheStateFolderAndCreatesNothing)
-{
-    for (const auto& [stateHome, expected] :
-         {std::pair<const char*, const char*>{"/state/", "/state/WyxProgress"},
-          {"state", "/home/u/.local/state/WyxProgress"}})
-    {
-        ScopedEnv state("XDG_STATE_HOME", stateHome), home("HOME", "/home/u");
-        WyxLogger::SetLogDirectory("WyxProgress");
-        EXPECT_EQ(WyxLogger::GetLogDirectory(), expected) << stateHome;
-    }
-    EXPECT_FALSE(std::filesystem::exists("/state"));
 }
 
 // A relative root means the folder it named when the program started,
