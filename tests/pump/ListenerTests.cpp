@@ -1,7 +1,6 @@
 // The listener registry, its polling thread, and the bus that carries the
 // models' updates to the views.
 #include <atomic>
-#include <chrono>
 #include <memory>
 #include <new>
 #include <string>
@@ -10,13 +9,13 @@
 
 #include <gtest/gtest.h>
 #include <wx/app.h>
-#include <wx/init.h>
 
 #include "pump/ServerEventListner.h"
 #include "pump/TimerThread.h"
 #include "pump/bus/CustomEvents.h"
 #include "pump/bus/EventBus.h"
 
+#include "SystemRoot.h"
 #include "WaitUntil.h"
 
 namespace
@@ -24,12 +23,7 @@ namespace
 
 // The pump needs the library's thread module and an application object for its
 // pending-event queues; a console application is enough.
-struct WxBaseEnvironment : ::testing::Environment
-{
-    void SetUp() override { ASSERT_TRUE(wxInitialize()); }
-    void TearDown() override { wxUninitialize(); }
-};
-const auto* const registered = ::testing::AddGlobalTestEnvironment(new WxBaseEnvironment);
+const auto* const registered = ::testing::AddGlobalTestEnvironment(new wyxtest::WxEnvironment);
 
 struct StopCase
 {
@@ -205,23 +199,4 @@ TEST(EventBus, EachLiveSubscriptionGetsAQueuedCopyUntilItsHandlerLeaves)
     }
     publishing = false;
     publisher.join();
-}
-
-// Listeners added and removed while passes run at a millisecond's interval,
-// then a stop: a thread the stop does not join is still ending when its
-// object goes, which the library's end of the process trips over.
-TEST(PollingThread, ListenersComeAndGoWhilePassesRun)
-{
-    Listener listener, visitor;
-    ServerEventListner registry;
-    registry.SetPollingInterval(1);
-    registry.AddListener("OnNewData", &listener);
-    ASSERT_TRUE(registry.StartTimer());
-    for (int round = 0; round < 2000; ++round)
-    {
-        EXPECT_TRUE(registry.AddListener("Visitor", &visitor));
-        EXPECT_EQ(registry.RemoveListener("Visitor"), &visitor);
-    }
-    WaitUntil([&, until = listener.calls + 2] { return listener.calls >= until; });
-    EXPECT_TRUE(registry.StopTimer());
 }
