@@ -13,7 +13,7 @@ namespace
 // The instance reads the file below WYX_SYSTEM_ROOT at every call; each file
 // text (raw bytes: a stray one costs only its own line) gives the hot folders
 // and the servers, each list joined by '|'.
-TEST(DataSource, ReadsEachSectionAnewAtEachCallLineByLineWaitsOnNoFifoAndLogsEachIconChange)
+TEST(DataSource, ReadsEachSectionAnewAtEachCallLineByLineAndWaitsOnNoFifo)
 {
     wyxtest::SystemRoot root;
     const wxString ini = GetDataDirectory() + "HotFolders.ini";
@@ -27,7 +27,6 @@ TEST(DataSource, ReadsEachSectionAnewAtEachCallLineByLineWaitsOnNoFifoAndLogsEac
     };
     EXPECT_EQ(lists(), " ") << "no file";
     for (const auto& [text, expected] : std::vector<std::pair<const char*, const char*>>{
-             {"", " "},
              {"/orphan\n[Servers]\nPRN-1\n", " PRN-1"},
              {"[HotFolders]\n/srv/a\n/srv/b c\n[Servers]\nPRN-1\nPRN 2\n", "/srv/a|/srv/b c PRN-1|PRN 2"},
              {"[hotfolders]\r\n  /srv/a  \r\n\r\n; /srv/commented\r\n# also\r\n[ SERVERS ]\r\nX\r\n",
@@ -36,8 +35,7 @@ TEST(DataSource, ReadsEachSectionAnewAtEachCallLineByLineWaitsOnNoFifoAndLogsEac
              {"[Servers]\nSt\xC3\xBCttgart-01\n[HotFolders]\n/srv/\xE6\x97\xA5\n",
               "/srv/\xE6\x97\xA5 St\xC3\xBCttgart-01"},
              {"[HotFolders]\n/srv/Z\xC3\xBCrich\n/srv/M\xFCnchen\n[Servers]\nPRN-1\n",
-              "/srv/Z\xC3\xBCrich|/srv/M\xC3\xBCnchen PRN-1"},
-             {"[Servers\nA\n", " "}})
+              "/srv/Z\xC3\xBCrich|/srv/M\xC3\xBCnchen PRN-1"}})
     {
         std::ofstream(ini.utf8_string(), std::ios::binary) << text;
         EXPECT_EQ(lists(), wxString::FromUTF8(expected)) << text;
@@ -45,21 +43,6 @@ TEST(DataSource, ReadsEachSectionAnewAtEachCallLineByLineWaitsOnNoFifoAndLogsEac
     wxRemoveFile(ini);
     ASSERT_EQ(::mkfifo(ini.utf8_str(), 0666), 0);
     EXPECT_EQ(lists(), " ");
-
-    // Each icon change is logged, and still recorded without a data folder; what is kept
-    // in memory is checked with the folder errors that cause it.
-    WyxDataSource& source = WyxDataSource::GetInstance();
-    EXPECT_EQ(source.ChangeHotfolderIcon("/srv/a", false), 0);
-    EXPECT_EQ(source.ChangeHotfolderIcon("/srv/b b", true), 0);
-    EXPECT_EQ(source.ChangeHotfolderIcon("", false), 1);
-    wxFFile log(WyxDataSource::IconLogPath(), "rb");
-    wxString text;
-    ASSERT_TRUE(log.IsOpened() && log.ReadAll(&text, wxConvUTF8));
-    EXPECT_EQ(text, "/srv/a\t0\n/srv/b b\t1\n");
-    wxFileName::Rmdir(GetDataDirectory(), wxPATH_RMDIR_RECURSIVE);
-    const size_t before = source.GetIconChanges().size();
-    EXPECT_EQ(source.ChangeHotfolderIcon("/srv/a", false), 0);
-    EXPECT_EQ(source.GetIconChanges().size(), before + 1);
 }
 
 } // namespace
