@@ -4,8 +4,6 @@
 
 #include <gtest/gtest.h>
 
-#include <wx/log.h>
-
 #include "../log/LogTestSupport.h"
 #include "../status/StatusTestSupport.h"
 #include "data/JobLogManager.h"
@@ -22,7 +20,6 @@ const auto* const kWx = testing::AddGlobalTestEnvironment(new wyxtest::WxEnviron
 // this one test makes all of its checks in one system root.
 TEST(JobsProgressNotify, OnePassRefreshesBothModelsAndStoppingReachesBoth)
 {
-    wxLog::EnableLogging(false);
     wyxtest::SystemRoot root;
     const wxString logJournal = GetDataDirectory() + "TiveraJobsLogFile.txt";
     const wxString statusJournal = GetDataDirectory() + "TiveraJobsStatusFile.txt";
