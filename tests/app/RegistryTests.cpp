@@ -33,7 +33,6 @@ TEST(RegistryFile, ParsingFindsExactlyTheValuesTheFileHolds)
              {"[ SOFTWARE\\Kelvo Systems\\CrashReporter ]\nInstallPath=/x\n", kCrashKey, "InstallPath", "/x"},
              {kCrash + "InstallPath=\n", kCrashKey, "InstallPath", ""},
              {kCrash + "InstallPath=/a=b\n", kCrashKey, "InstallPath", "/a=b"},
-             {kCrash + "A=1\n[Other]\nB=2\n" + kCrash + "InstallPath=/c\n", kCrashKey, "A", "1"},
              {"; a comment\n# another\n" + kCrash + ";InstallPath=/no\n", kCrashKey, "InstallPath", nullptr},
              {"InstallPath=/orphan\n", "", "InstallPath", nullptr},
              {kCrash + "[broken\nInstallPath=/x\n", kCrashKey, "InstallPath", nullptr},

@@ -66,11 +66,10 @@ TEST(QueryAnswers, EachControlAnswersItsOwnMessagesInRangeAndNoOthers)
     const struct { FakeSource Fixture::*to; unsigned message; std::uintptr_t wParam; std::intptr_t lParam;
                    Answer answer; } cases[] = {
         {L, kLvmGetItemCount, 0, 0, 3}, {L, kLvmGetHeader, 0, 0, 0x2000}, {L, kLvmGetItemState, 2, kSelFoc, 1},
-        {L, kLvmGetItemState, 3, kSelFoc, kNo}, {L, kLvmColumnCountQuery, 3, 0, kNo}, {L, kCbGetCount, 0, 0, kNo},
-        {L, kKind, 5, 0, 0}, {L, kKind, kKindQuery, 8, 0}, {L, kLvmGetItemW, 0, 8, kNo},
-        {H, kHdmGetItemCount, 0, 0, 3}, {H, kLvmGetItemCount, 0, 0, kNo}, {H, kKind, kKindQuery, 0, kNo},
-        {C, kCbGetCount, 0, 0, 4}, {C, kLbGetCount, 0, 0, kNo}, {C, kCbGetLbTextLen, 4, 0, -1},
-        {C, kCbGetLbText, 1, 0, -1}, {P, kLbGetCount, 0, 0, 4}, {P, kCbGetCount, 0, 0, kNo}};
+        {L, kLvmGetItemState, 3, kSelFoc, kNo}, {L, kCbGetCount, 0, 0, kNo}, {L, kKind, kKindQuery, 8, 0},
+        {L, kLvmGetItemW, 0, 8, kNo}, {H, kHdmGetItemCount, 0, 0, 3}, {H, kKind, kKindQuery, 0, kNo},
+        {C, kCbGetCount, 0, 0, 4}, {C, kCbGetLbTextLen, 4, 0, -1}, {C, kCbGetLbText, 1, 0, -1},
+        {P, kLbGetCount, 0, 0, 4}, {P, kCbGetCount, 0, 0, kNo}};
     // clang-format on
     Fixture f;
     for (const auto& c : cases)

@@ -53,7 +53,6 @@ TEST(LanguageChoiceTest, ChoosesByVersionFromTheUserFileTheServerFileOrTheSystem
         {"3.3", "  fr_fr  \n", no, "", wxLANGUAGE_GERMAN, wxLANGUAGE_FRENCH_FRANCE},
         {"3.3", "sv_SE", no, "", wxLANGUAGE_DUTCH, wxLANGUAGE_DUTCH},
         {"3.3", no, no, "", wxLANGUAGE_ARABIC, wxLANGUAGE_ENGLISH_US},
-        {"3.3", no, "serverlang=de", "", kNone, wxLANGUAGE_ENGLISH_US},
         // 3.1: the server's file, then the locale's row of the program's table (by
         // its name with a codeset or modifier, or its language alone); never the user's file.
         {"3.1", no, "serverlang=PT", "fr_FR.UTF-8", kNone, wxLANGUAGE_PORTUGUESE_BRAZILIAN},

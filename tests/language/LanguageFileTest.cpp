@@ -33,7 +33,6 @@ TEST(LanguageFileTest, DecodesFindsTheCodesAndReadsBothFilesFromTheirPlacesButNo
     const std::tuple<const char*, const char*, const char*> lines[] = {
         {" \t de_DE \t", "de_DE", none},
         {"de_DE\rfr_FR", "de_DE", none},
-        {"\nde_DE", "", none},
         {"serverlang = fr \n", "serverlang = fr", "fr"},
         {"serverlang=fr\r\nserverlang=de\r\n", "serverlang=fr", "de"},
         {"serverlang=a=b", "serverlang=a=b", "a=b"},
