@@ -6,29 +6,23 @@
 #include <wx/log.h>
 
 #include <memory>
-#include <vector>
 
 #include "app/NoLog.h"
 #include "app/WyxAppTraits.h"
 
-std::vector<wxString> g_asserts;
+int g_asserts = 0;
 
 TEST(NoLog, IsTheTraitsTargetAndDropsEveryMessageWithoutComplaint)
 {
     std::unique_ptr<wxLog> target(WyxAppTraits().CreateLogTarget());
     ASSERT_NE(dynamic_cast<NoLog*>(target.get()), nullptr);
-    const wxAssertHandler_t previousHandler =
-        wxSetAssertHandler([](const wxString&, int, const wxString&, const wxString& cond,
-                              const wxString& msg) { g_asserts.push_back(msg.empty() ? cond : msg); });
-    const bool wasEnabled = wxLog::EnableLogging(true);
-    wxLog::SetLogLevel(wxLOG_Info);
-    wxLog* const previousTarget = wxLog::SetActiveTarget(target.get());
+    wxSetAssertHandler([](const wxString&, int, const wxString&, const wxString&, const wxString&)
+                       { ++g_asserts; });
+    wxLog::EnableLogging(true); // the test main turns it off
+    wxLog* const previous = wxLog::SetActiveTarget(target.get());
     wxLogError("cannot open file '%s'", "wyx_folder.ico");
-    wxLogWarning("catalog '%s' not found", "wyx3");
     wxLogInfo("information");
     wxLog::FlushActive();
-    wxLog::SetActiveTarget(previousTarget);
-    wxLog::EnableLogging(wasEnabled);
-    wxSetAssertHandler(previousHandler);
-    EXPECT_TRUE(g_asserts.empty()) << g_asserts.front();
+    wxLog::SetActiveTarget(previous);
+    EXPECT_EQ(g_asserts, 0);
 }

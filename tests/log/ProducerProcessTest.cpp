@@ -19,23 +19,22 @@ const auto* const g_wx = ::testing::AddGlobalTestEnvironment(new logtest::WxEnvi
 TEST(LogModelBesideAProducerProcess, ListsEveryJobExactlyOnceAcrossTrimming)
 {
     logtest::SystemRoot root;
-    const int jobs = WYX_LOG_PRODUCER_JOBS;
-    const int seedLines = 10000 - jobs / 3;
+    const int jobs = WYX_LOG_PRODUCER_JOBS, seedLines = 10000 - jobs / 3;
     wxString seed, finished;
     for (int i = 0; i < seedLines; ++i)
         seed += logtest::LogLine(wxString::Format("seed-%d", i), "ADDED");
+    for (int i = 0; i < jobs; ++i)
+        finished += logtest::LogLine(wxString::Format("job-%d", i), "").BeforeLast('\t') + "\n";
     logtest::SystemRoot::WriteFile(root.JournalPath(), seed);
+    logtest::SystemRoot::WriteFile(root.Path() + "/finished-jobs.txt", finished);
     JobLogManager model(root.JournalPath());
     ASSERT_EQ(1, model.Parse());
 
     // One wyx-journal process appends every finished job, each append a whole
     // locked read and rewrite of the journal, as the service does.
-    const wxString input = root.Path() + "/finished-jobs.txt";
-    for (int i = 0; i < jobs; ++i)
-        finished += logtest::LogLine(wxString::Format("job-%d", i), "").BeforeLast('\t') + "\n";
-    logtest::SystemRoot::WriteFile(input, finished);
     const std::string command =
-        wxString::Format("'%s' log add - < '%s'", WYX_JOURNAL_TOOL, input).utf8_string();
+        wxString::Format("'%s' log add - < '%s/finished-jobs.txt'", WYX_JOURNAL_TOOL, root.Path())
+            .utf8_string();
     auto producer = std::async(std::launch::async, [&] { return std::system(command.c_str()); });
     // What the polling thread does, driven here until the producer is done.
     while (producer.wait_for(std::chrono::seconds(0)) != std::future_status::ready)
