@@ -26,13 +26,8 @@ public:
         const std::string home = (folder.Path() / "home").string();
         std::filesystem::create_directories(home + "/run");
         ::chmod((home + "/run").c_str(), 0700);
-        environment = {"HOME=" + home,
-                       "WYX_SYSTEM_ROOT=" + (folder.Path() / "root").string(),
-                       "XDG_CONFIG_HOME=" + home + "/.config",
-                       "XDG_STATE_HOME=" + home + "/.local/state",
-                       "XDG_RUNTIME_DIR=" + home + "/run",
-                       "GDK_BACKEND=x11",
-                       "LANG=C.UTF-8"};
+        environment = {"HOME=" + home, "WYX_SYSTEM_ROOT=" + (folder.Path() / "root").string(),
+                       "XDG_RUNTIME_DIR=" + home + "/run", "LANG=C.UTF-8"};
         if (!accessibility)
             environment.push_back("NO_AT_BRIDGE=1");
         for (const char* name :
@@ -41,35 +36,28 @@ public:
                 environment.push_back(std::string(name) + "=" + value);
     }
 
-    // Whether the folder and the display are there; a failure says what is missing.
-    ::testing::AssertionResult Ready() const
-    {
-        return folder.Path().empty() ? ::testing::AssertionFailure() << "no temporary folder"
-               : x.IsOpen()
-                   ? ::testing::AssertionSuccess()
-                   : ::testing::AssertionFailure() << "no X display: run the tests under xvfb-run -a";
-    }
+    // The folder and the display are there (the tests run under xvfb-run -a).
+    bool Ready() const { return !folder.Path().empty() && x.IsOpen(); }
 
-    // Runs a program to its end; its exit code, or -1 when it did not exit.
+    // Runs a program to its end; its wait status (0 when it exited with code 0).
     int Run(const std::string& program, const std::vector<std::string>& arguments) const
     {
-        const int status = Program(program, environment, std::nullopt, arguments).Wait();
-        return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+        return Program(program, environment, std::nullopt, arguments).Wait();
     }
 
     // The program's window once it is mapped; 0, with a failure, when the program ended first.
     Window WaitForWindow(Program& program)
     {
         const Window window = x.WaitForWindow(program);
-        EXPECT_NE(window, 0u) << "no window: the program " << program.Outcome();
+        EXPECT_NE(window, 0u) << "no window: the program ended with wait status " << program.Wait();
         return window;
     }
 
-    // Closes the window as the user does; the program must end with exit code 0.
+    // Closes the window as the user does; the program must end with exit code 0, not a signal.
     void Close(Program& program, Window window)
     {
         x.RequestClose(window);
-        EXPECT_EQ(program.Wait(), 0) << program.Outcome(); // exit code 0, not a signal
+        EXPECT_EQ(program.Wait(), 0);
     }
 
     TempFolder folder;

@@ -7,12 +7,10 @@
 #include <X11/Xutil.h>
 
 #include <grp.h>
-#include <poll.h>
 #include <signal.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <cerrno>
 #include <memory>
 #include <optional>
 #include <string>
@@ -52,25 +50,15 @@ public:
 
     pid_t Pid() const { return m_pid; }
     bool HasEnded() { return Reap(WNOHANG); }
-    // Blocks until the process ends; its wait status.
+    // Blocks until the process ends; its wait status (-1 when there is none to have).
     int Wait() { return Reap(0) ? *m_status : -1; }
-
-    // How the process ended, for failure messages.
-    std::string Outcome()
-    {
-        if (!HasEnded())
-            return "still running";
-        return WIFSIGNALED(*m_status) ? "ended by signal " + std::to_string(WTERMSIG(*m_status))
-                                      : "ended with exit code " + std::to_string(WEXITSTATUS(*m_status));
-    }
 
 private:
     bool Reap(int flags)
     {
         int status = 0;
-        for (pid_t got = 0; !m_status && (got = ::waitpid(m_pid, &status, flags)) != 0;)
-            if (got == m_pid || errno != EINTR)
-                m_status = got == m_pid ? status : -1;
+        if (const pid_t got = m_status ? 0 : ::waitpid(m_pid, &status, flags))
+            m_status = got == m_pid ? status : -1;
         return m_status.has_value();
     }
 
@@ -78,16 +66,11 @@ private:
     std::optional<int> m_status;
 };
 
-// A connection to the display that watches top-level windows appear.
+// A connection to the display the program's windows appear on.
 class XSession
 {
 public:
-    XSession()
-    {
-        XSetErrorHandler([](Display*, XErrorEvent*) { return 0; });
-        if (IsOpen())
-            XSelectInput(m_display, DefaultRootWindow(m_display), SubstructureNotifyMask);
-    }
+    XSession() { XSetErrorHandler(IgnoreErrors); }
 
     bool IsOpen() const { return m_display != nullptr; }
 
@@ -96,7 +79,7 @@ public:
     {
         const long pid = program.Pid();
         const std::string owner(reinterpret_cast<const char*>(&pid), sizeof pid);
-        for (;;)
+        for (;; ::usleep(20000))
         {
             Window root = 0, parent = 0, found = 0, *children = nullptr;
             unsigned int count = 0;
@@ -104,19 +87,15 @@ public:
             for (unsigned int i = 0; i < count && found == 0; ++i)
                 if (Attributes(children[i]).map_state == IsViewable &&
                     !Attributes(children[i]).override_redirect &&
-                    Property(children[i], "_NET_WM_PID", AnyPropertyType, 32) == owner)
+                    Property(children[i], "_NET_WM_PID") == owner)
                     found = children[i];
             XFree(children);
             if (found != 0 || program.HasEnded())
                 return found;
-            pollfd connection{ConnectionNumber(m_display), POLLIN, 0};
-            ::poll(&connection, 1, 100); // the timeout only lets the loop notice a program that ended
-            for (XEvent event; XPending(m_display) > 0;)
-                XNextEvent(m_display, &event);
         }
     }
 
-    std::string Title(Window window) { return Property(window, "_NET_WM_NAME", AnyPropertyType, 8); }
+    std::string Title(Window window) { return Property(window, "_NET_WM_NAME"); }
 
     XWindowAttributes Attributes(Window window)
     {
@@ -158,19 +137,20 @@ public:
     }
 
 private:
-    // A property's bytes (format 8) or longs (format 32); empty when the window has none of that format.
-    std::string Property(Window window, const char* name, Atom type, int wanted)
+    // A window may go between finding it and reading it: that is no error here.
+    static int IgnoreErrors(Display*, XErrorEvent*) { return 0; }
+
+    // A property's bytes (a title) or longs (a process id), as they are stored.
+    std::string Property(Window window, const char* name)
     {
-        Atom actual = 0;
+        Atom type = 0;
         int format = 0;
         unsigned long items = 0, remaining = 0;
         unsigned char* data = nullptr;
-        XGetWindowProperty(m_display, window, XInternAtom(m_display, name, False), 0, 1024, False, type,
-                           &actual, &format, &items, &remaining, &data);
-        const std::string bytes =
-            data == nullptr || format != wanted
-                ? ""
-                : std::string(reinterpret_cast<char*>(data), format == 32 ? items * sizeof(long) : items);
+        XGetWindowProperty(m_display, window, XInternAtom(m_display, name, False), 0, 1024, False,
+                           AnyPropertyType, &type, &format, &items, &remaining, &data);
+        const std::string bytes(reinterpret_cast<char*>(data),
+                                data ? (format == 32 ? sizeof(long) : 1) * items : 0);
         XFree(data);
         return bytes;
     }
