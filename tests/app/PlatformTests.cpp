@@ -8,7 +8,7 @@
 #include <chrono>
 #include <ctime>
 #include <fstream>
-#include <sstream>
+#include <iterator>
 #include <thread>
 #include <vector>
 
@@ -33,11 +33,7 @@ TEST(CrashReporter, OnlyALibraryWithBothEntriesIsFoundThroughTheRegistryInstalle
     const std::string log = (folder.Path() / "calls.log").string();
     ScopedEnv logVariable("WYX_TEST_CRASH_LOG", log), root("WYX_SYSTEM_ROOT", folder.Path().string());
     const auto calls = [&]
-    {
-        std::stringstream text;
-        text << std::ifstream(log).rdbuf();
-        return text.str();
-    };
+    { return std::string(std::istreambuf_iterator<char>(std::ifstream(log).rdbuf()), {}); };
     EXPECT_EQ(CrashReporterLibraryPath(), "");
     const std::string libraryFolder = std::filesystem::path(WYX_FULL_REPORTER).parent_path().string();
     folder.Write("etc/kelvo/registry.ini",

@@ -16,7 +16,6 @@ namespace automationtest
 struct FakeSource : automation::AutomationSource
 {
     automation::ControlKind kind = automation::ControlKind::ListCtrl;
-    std::uintptr_t handle = 0x1000;
     std::vector<std::vector<std::u16string>> rows; // a box's entries are rows of one cell
     std::vector<unsigned> states;
     std::vector<automation::ColumnInfo> columns;
@@ -27,7 +26,7 @@ struct FakeSource : automation::AutomationSource
     const FakeSource *header = nullptr, *popup = nullptr;
 
     automation::ControlKind Kind() const override { return kind; }
-    std::uintptr_t Handle() const override { return handle; }
+    std::uintptr_t Handle() const override { return reinterpret_cast<std::uintptr_t>(this); }
     long ItemCount() const override { return static_cast<long>(rows.size()); }
     std::u16string ItemText(long item, int column) const override // negative positions wrap to none
     {

@@ -13,7 +13,6 @@
 using namespace automation;
 using namespace automation::native;
 using automationtest::FakeSource;
-using automationtest::Region;
 
 namespace
 {
@@ -28,7 +27,8 @@ const Answer kNo = std::nullopt;
 struct Fixture
 {
     alignas(16) unsigned char bytes[4096] = {};
-    RegionList memory{{Region(bytes, 2048), Region(bytes + 2048, 2048, false)}};
+    RegionList memory{
+        {automationtest::Region(bytes, 2048), automationtest::Region(bytes + 2048, 2048, false)}};
     FakeSource list, header, combo, popup;
 
     Fixture()
@@ -42,7 +42,6 @@ struct Fixture
         list.header = &header;
         header = list;
         header.kind = ControlKind::Header;
-        header.handle = 0x2000;
         combo.kind = ControlKind::ComboBox;
         combo.rows = {{u"All"}, {u"PRN-01"}, {u"prn-02"}, {u"\u00c4rger"}};
         combo.current = combo.top = 1;
@@ -65,7 +64,7 @@ TEST(QueryAnswers, EachControlAnswersItsOwnMessagesInRangeAndNoOthers)
     // clang-format off
     const struct { FakeSource Fixture::*to; unsigned message; std::uintptr_t wParam; std::intptr_t lParam;
                    Answer answer; } cases[] = {
-        {L, kLvmGetItemCount, 0, 0, 3}, {L, kLvmGetHeader, 0, 0, 0x2000}, {L, kLvmGetItemState, 2, kSelFoc, 1},
+        {L, kLvmGetItemCount, 0, 0, 3}, {L, kLvmGetItemState, 2, kSelFoc, 1},
         {L, kLvmGetItemState, 3, kSelFoc, kNo}, {L, kCbGetCount, 0, 0, kNo}, {L, kKind, kKindQuery, 8, 0},
         {L, kLvmGetItemW, 0, 8, kNo}, {H, kHdmGetItemCount, 0, 0, 3}, {H, kKind, kKindQuery, 0, kNo},
         {C, kCbGetCount, 0, 0, 4}, {C, kCbGetLbTextLen, 4, 0, -1}, {C, kCbGetLbText, 1, 0, -1},
@@ -74,6 +73,7 @@ TEST(QueryAnswers, EachControlAnswersItsOwnMessagesInRangeAndNoOthers)
     Fixture f;
     for (const auto& c : cases)
         EXPECT_EQ(f.Ask(f.*c.to, c.message, c.wParam, c.lParam), c.answer) << "case " << &c - cases;
+    EXPECT_EQ(f.Ask(f.list, kLvmGetHeader, 0, 0), std::intptr_t(&f.header));
 
     // No structure is filled in read-only memory or across the arena's end.
     const std::pair<FakeSource Fixture::*, unsigned> fills[] = {
@@ -127,7 +127,7 @@ TEST(QueryAnswers, TextsGoOnlyIntoWritableBuffersWithRoomForThemAndTheirTerminat
     EXPECT_EQ(f.Ask(f.popup, kLbFindStringExact, 1, f.Address(2048 - 6)), -1);
     f.popup.rows.push_back({std::u16string(kMaxSearchText - 1, u'x')});
     std::vector<char16_t> search(kMaxSearchText + 1, u'x');
-    const RegionList memory({Region(search.data(), search.size() * 2)});
+    const RegionList memory({automationtest::Region(search.data(), search.size() * 2)});
     search[kMaxSearchText] = 0;
     EXPECT_EQ(AnswerQuery(f.popup, kLbFindStringExact, 1, std::intptr_t(search.data()), {kKind, memory}), -1);
     search[kMaxSearchText - 1] = 0;
