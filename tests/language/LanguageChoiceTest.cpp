@@ -45,7 +45,6 @@ struct FakeSources : uilanguage::LanguageSources
 
 TEST(LanguageChoiceTest, ChoosesByVersionFromTheUserFileTheServerFileOrTheSystemsLocale)
 {
-    constexpr int kNone = wxLANGUAGE_UNKNOWN;
     const std::nullopt_t no = std::nullopt;
     const Case cases[] = {
         // 3.3: the per-user file (case and blanks do not count), else the system's
@@ -55,10 +54,10 @@ TEST(LanguageChoiceTest, ChoosesByVersionFromTheUserFileTheServerFileOrTheSystem
         {"3.3", no, no, "", wxLANGUAGE_ARABIC, wxLANGUAGE_ENGLISH_US},
         // 3.1: the server's file, then the locale's row of the program's table (by
         // its name with a codeset or modifier, or its language alone); never the user's file.
-        {"3.1", no, "serverlang=PT", "fr_FR.UTF-8", kNone, wxLANGUAGE_PORTUGUESE_BRAZILIAN},
-        {"3.1", no, "serverlang=sv", "zh_TW.UTF-8", kNone, wxLANGUAGE_CHINESE_TAIWAN},
-        {"3.1", no, no, "sr_RS@latin", kNone, wxLANGUAGE_SERBIAN_LATIN_SERBIA},
-        {"3.1", no, no, "fr", kNone, wxLANGUAGE_FRENCH_FRANCE},
+        {"3.1", no, "serverlang=PT", "fr_FR.UTF-8", wxLANGUAGE_UNKNOWN, wxLANGUAGE_PORTUGUESE_BRAZILIAN},
+        {"3.1", no, "serverlang=sv", "zh_TW.UTF-8", wxLANGUAGE_UNKNOWN, wxLANGUAGE_CHINESE_TAIWAN},
+        {"3.1", no, no, "sr_RS@latin", wxLANGUAGE_UNKNOWN, wxLANGUAGE_SERBIAN_LATIN_SERBIA},
+        {"3.1", no, no, "fr", wxLANGUAGE_UNKNOWN, wxLANGUAGE_FRENCH_FRANCE},
         {"3.1", "de_DE", no, "POSIX", wxLANGUAGE_GERMAN, wxLANGUAGE_UNKNOWN},
         // 3.0 and none: the system's default; any other (even " 3.3") stays English.
         {"3.0", "de_DE", "serverlang=de", "fr_FR", wxLANGUAGE_GERMAN, wxLANGUAGE_DEFAULT},

@@ -28,16 +28,15 @@ TEST(LanguageFileTest, DecodesFindsTheCodesAndReadsBothFilesFromTheirPlacesButNo
         EXPECT_EQ(uilanguage::DecodeLanguageFile(bytes).utf8_string(), expected) << expected;
 
     // The user's code is the trimmed first line; the server's the value of the
-    // last line that starts "serverlang" (none: no such line).
-    const char* const none = nullptr;
+    // last line that starts "serverlang" (nullptr: no such line).
     const std::tuple<const char*, const char*, const char*> lines[] = {
-        {" \t de_DE \t", "de_DE", none},
-        {"de_DE\rfr_FR", "de_DE", none},
+        {" \t de_DE \t", "de_DE", nullptr},
+        {"de_DE\rfr_FR", "de_DE", nullptr},
         {"serverlang = fr \n", "serverlang = fr", "fr"},
         {"serverlang=fr\r\nserverlang=de\r\n", "serverlang=fr", "de"},
         {"serverlang=a=b", "serverlang=a=b", "a=b"},
-        {" serverlang=de", "serverlang=de", none},
-        {"", "", none},
+        {" serverlang=de", "serverlang=de", nullptr},
+        {"", "", nullptr},
     };
     for (const auto& [text, user, server] : lines)
     {
