@@ -67,7 +67,12 @@ TEST(MainFrameTest, OpensOnTheStatusTabFillsTheWindowDrawsTheTabsInTheThemeColou
     }
 
     bool reachedFrame = false;
-    frame->Bind(wxEVT_CHAR_HOOK, [&](wxKeyEvent& event) { reachedFrame = true, event.Skip(); });
+    frame->Bind(wxEVT_CHAR_HOOK,
+                [&](wxKeyEvent& event)
+                {
+                    reachedFrame = true;
+                    event.Skip();
+                });
     const int ctrl = wxMOD_CONTROL, back = wxMOD_CONTROL | wxMOD_SHIFT, shift = wxMOD_SHIFT,
               none = wxMOD_NONE;
     // Control keys in the page (where the focus is) cycle; arrows on the strip stop at the ends.
