@@ -158,8 +158,10 @@ TEST(LocaleReference, DateAndTimeEqualTheCLibrarysFormats)
         }
         freelocale(reference);
     }
-    // Names come in the locale's own encoding.
+    // Names come in the locale's own encoding; a locale the system lacks (a user's LANG may name one) is
+    // refused rather than read through a null handle.
     wyxos::LocaleTimeInfo utf8, latin1;
+    EXPECT_FALSE(wyxos::ReadLocaleTimeInfo("xx_NOWHERE.UTF-8", utf8));
     ASSERT_TRUE(wyxos::ReadLocaleTimeInfo("de_DE.UTF-8", utf8) &&
                 wyxos::ReadLocaleTimeInfo("de_DE.ISO-8859-1", latin1));
     EXPECT_EQ(latin1.names.months[2] + utf8.names.months[2] + utf8.names.days[0] +
