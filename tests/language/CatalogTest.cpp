@@ -41,7 +41,8 @@ TEST(CatalogTest, EveryLanguageLoadsItsOwnCompleteCatalogThroughTheLocale)
         const std::string completeLog = wxGetTranslation("Complete Log").utf8_string();
         EXPECT_EQ(completeLog == "Complete Log", name == "en_US") << completeLog;
         // Two neighbours that share a language; the rest need only not be English.
-        EXPECT_EQ(completeLog, name == "zh_CN" ? "完整日志" : name == "zh_TW" ? "完整記錄" : completeLog);
+        if (name == "zh_CN" || name == "zh_TW")
+            EXPECT_EQ(completeLog, name == "zh_CN" ? "完整日志" : "完整記錄");
         const wxString footer = wxGetTranslation("[WYX3Value1] of [WYX3Value2] items selected.");
         EXPECT_EQ(wxString(footer).Replace("[WYX3Value1]", ""), 1u) << footer;
         EXPECT_EQ(wxString(footer).Replace("[WYX3Value2]", ""), 1u) << footer;
