@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <cstring>
 #include <filesystem>
 #include <memory>
 #include <string>
@@ -91,6 +92,12 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     if (wxConvUTF8.ToWChar(nullptr, 0, bytes, size) != wxCONV_FAILED)
     {
         wxString whole(bytes, wxConvUTF8, size);
+        // The library also takes overlong forms (E0 9B BF for U+06FF), which the
+        // reader, strict, does not: only text that encodes back to the same bytes
+        // is valid UTF-8 here.
+        const wxScopedCharBuffer canonical = whole.utf8_str();
+        if (canonical.length() != size || std::memcmp(canonical.data(), bytes, size) != 0)
+            return 0;
         while (whole.StartsWith(L"\uFEFF"))
             whole.erase(0, 1);
         // The library lets encoded surrogates and values beyond U+10FFFF through; the
